@@ -1,0 +1,215 @@
+#include "Attribute.h"
+
+#include <iostream>
+#include <utility>
+
+#include "CaseFolding.h"
+#include "ClauseShapes.h"
+#include "TracePoints.h"
+
+using libschema::isOneOf;
+using libschema::readValue;
+
+namespace {
+
+// The values of USAGE. A definition without the clause has the first; what a file gives is not
+// checked against them.
+const std::string userApps = "userApplications";
+[[maybe_unused]] const std::string dirOp = "directoryOperation";
+[[maybe_unused]] const std::string disOp = "distributedOperation";
+[[maybe_unused]] const std::string dsaOp = "dSAOperation";
+
+// What ends an attribute type: the end of the input and the keyword of any definition are failures.
+bool endsDefinition(int token) {
+  return isOneOf(
+      token, {')', '}', TOKEN_END, KEY_ORVATTRIBUTETYPES, KEY_OBJECTCLASSES, KEY_ATTRIBUTETYPES});
+}
+
+// What ends NAME. Neither ")" nor the end of the input does.
+bool endsNames(int token) {
+  return isOneOf(token,
+                 {KEY_DESC, KEY_SYNTAX, KEY_OBSOLETE, KEY_SUP, KEY_USAGE, KEY_NO_USER_MODIFICATION,
+                  KEY_COLLECTIVE, KEY_SINGLE_VALUE, KEY_SUBSTR, KEY_ORDERING, KEY_EQUALITY});
+}
+
+// Reads a single name and a list of names alike: whatever is no name is passed over. The first
+// token after NAME is taken untested, and ")" does not end the clause, so a definition that closes
+// after its names reads on into the next one; at the end of the input the loop does not end.
+// AttributeParse.NameReadsOnIntoTheNextDefinition, AttributeParse.NameAtTheEndNeverCompletes.
+int readNames(SchemaLexan* lexer, libschema::DistinctNames* names) {
+  lexer->match(KEY_NAME);
+  int token = lexer->getCurrentToken();
+  do {
+    if (isOneOf(token, {TOKEN_NAME, KEY_OBJECTCLASSES, KEY_ATTRIBUTETYPES})) {
+      names->add(libschema::textOf(lexer));
+    }
+    token = lexer->lexan();
+    if (token == TOKEN_END) {
+      libschema::spin();
+    }
+  } while (!endsNames(token));
+  return token;
+}
+
+// Each SUP adds one value, a repeated one too.
+int readSuperior(SchemaLexan* lexer, std::vector<std::string>* superiors) {
+  if (isOneOf(lexer->lexan(), {TOKEN_NUMBER, TOKEN_NAME})) {
+    superiors->push_back(libschema::textOf(lexer));
+  }
+  return lexer->lexan();
+}
+
+}  // namespace
+
+Attribute::Attribute() : usage(userApps) {}
+
+Attribute::~Attribute() = default;
+
+// attributetypes=( OID
+//   NAME names  DESC name  OBSOLETE  SUP value  EQUALITY value  ORDERING value  SUBSTR value
+//   SYNTAX value  SINGLE-VALUE  COLLECTIVE  NO-USER-MODIFICATION  USAGE name )
+// in any order, each any number of times.
+int Attribute::parse(SchemaLexan* lexer) {
+  tracepoint::AttributeParse trace;
+  libschema::DistinctNames distinctNames(&names);
+  lexer->match(lexer->getCurrentToken());
+  lexer->match('(');
+  int token = lexer->getCurrentToken();
+  while (!endsDefinition(token)) {
+    token = token == KEY_NAME ? readNames(lexer, &distinctNames) : parseClause(lexer, token);
+  }
+  if (token == ')') {
+    lexer->lexan();
+    return trace.status(1);
+  }
+  return trace.status(token == '}' ? 1 : 0);
+}
+
+// Reads one clause other than NAME and returns the token behind it.
+int Attribute::parseClause(SchemaLexan* lexer, int token) {
+  switch (token) {
+    case TOKEN_NUMBER:
+    case TOKEN_NAME:
+      // A bare word or number at clause level is the OID and the last one wins, so an unknown
+      // keyword and its value replace it.  AttributeParse.UnknownWordReplacesOid.
+      OID = libschema::textOf(lexer);
+      return lexer->lexan();
+    case KEY_DESC:
+      return readValue(lexer, {TOKEN_NAME}, &description);
+    case KEY_OBSOLETE:
+      isObsolete = true;
+      return lexer->lexan();
+    case KEY_SUP:
+      return readSuperior(lexer, &superiors);
+    case KEY_EQUALITY:
+      return readValue(lexer, {TOKEN_NUMBER, TOKEN_NAME}, &equality);
+    case KEY_ORDERING:
+      return readValue(lexer, {TOKEN_NUMBER, TOKEN_NAME}, &ordering);
+    case KEY_SUBSTR:
+      return readValue(lexer, {TOKEN_NUMBER, TOKEN_NAME}, &substr);
+    case KEY_SYNTAX:
+      return readValue(lexer, {TOKEN_NUMBER, TOKEN_NUMBER_LENGTH, TOKEN_NAME}, &syntax);
+    case KEY_SINGLE_VALUE:
+      singleValue = KEY_SINGLE_VALUE;
+      return lexer->lexan();
+    case KEY_NO_USER_MODIFICATION:
+      isUserModifiable = false;
+      return lexer->lexan();
+    case KEY_USAGE:
+      return readValue(lexer, {TOKEN_NAME}, &usage);
+    case KEY_COLLECTIVE:
+      // No further token is read: the loop meets COLLECTIVE again, for ever.
+      // AttributeParse.CollectiveNeverCompletes.
+      isCollective = true;
+      libschema::spin();
+      return token;
+    default:
+      return lexer->lexan();
+  }
+}
+
+// The order of the clauses, and every blank, belongs to the file format.
+void Attribute::composeLine(std::string* text) const {
+  text->append("attributetypes=( ").append(OID).append(" NAME ( ");
+  libschema::appendQuoted(names, text);
+  text->append(" ) ");
+  if (!description.empty()) {
+    text->append(" DESC '").append(description).append("' ");
+  }
+  if (isObsolete) {
+    text->append("OBSOLETE ");
+  }
+  if (!superiors.empty()) {
+    text->append("SUP ");
+    libschema::appendSpaced(superiors, text);
+  }
+  libschema::appendValue("EQUALITY ", equality, text);
+  libschema::appendValue("ORDERING ", ordering, text);
+  libschema::appendValue("SUBSTR ", substr, text);
+  libschema::appendValue("SYNTAX ", syntax, text);
+  if (singleValue == KEY_SINGLE_VALUE) {
+    text->append("SINGLE-VALUE ");
+  }
+  if (isCollective) {
+    text->append("COLLECTIVE ");
+  }
+  if (!isUserModifiable) {
+    text->append("NO-USER-MODIFICATION ");
+  }
+  libschema::appendValue("USAGE ", usage, text);
+  text->append(" )\n");
+}
+
+void Attribute::appendLine(std::string* text) const {
+  tracepoint::AttributeWrite trace;
+  composeLine(text);
+}
+
+void Attribute::dump(std::ofstream& out) {
+  tracepoint::AttributeWrite trace;
+  std::string line;
+  composeLine(&line);
+  libschema::writeLine(line, out);
+}
+
+void Attribute::dump() {
+  tracepoint::AttributePrint trace;
+  std::string text = "oid --> " + OID + "\nnames --> ";
+  libschema::appendSpaced(names, &text);
+  text += "\ndescription --> " + description + "\nequality --> " + equality + "\nsyntax --> " +
+          syntax + "\nordering --> " + ordering + "\nsubstr --> " + substr + "\nsuperior --> ";
+  libschema::appendSpaced(superiors, &text);
+  text += "\nusage --> " + usage + "\n";
+  std::cout << text << std::flush;
+}
+
+int Attribute::attrsEqual(const Attribute& other) const {
+  tracepoint::AttributeAttrsEqual trace;
+  const bool isEqual =
+      OID == other.OID && description == other.description && equality == other.equality &&
+      usage == other.usage && syntax == other.syntax && ordering == other.ordering &&
+      substr == other.substr && singleValue == other.singleValue &&
+      isObsolete == other.isObsolete && isCollective == other.isCollective &&
+      isUserModifiable == other.isUserModifiable && names.size() == other.names.size() &&
+      superiors.size() == other.superiors.size() && libschema::hasPartners(names, other.names) &&
+      libschema::hasPartners(superiors, other.superiors);
+  return trace.status(isEqual ? 1 : 0);
+}
+
+std::string Attribute::getOid() const { return OID; }
+
+std::string Attribute::getDescription() const { return description; }
+
+std::vector<std::string> Attribute::getSuperior() const { return superiors; }
+
+std::string Attribute::getFirstName() const {
+  return names.empty() ? std::string() : names.front();
+}
+
+std::vector<std::string> Attribute::getNames() const { return names; }
+
+std::string Attribute::getFirstNameLower() const { return libschema::lowered(getFirstName()); }
+
+std::string Attribute::convert(std::string s) const { return libschema::lowered(std::move(s)); }
+
+std::string Attribute::getOidAndName() const { return libschema::reportEntry(OID, names); }

@@ -1,0 +1,48 @@
+#include "CaseFolding.h"
+
+#include <algorithm>
+#include <cctype>
+
+namespace libschema {
+
+namespace {
+
+char lower(char c) { return static_cast<char>(std::tolower(static_cast<unsigned char>(c))); }
+
+bool equalLowered(const std::string& left, const std::string& right) {
+  return left.size() == right.size() &&
+         std::equal(left.begin(), left.end(), right.begin(),
+                    [](char a, char b) { return a == b || lower(a) == lower(b); });
+}
+
+}  // namespace
+
+std::string lowered(std::string text) {
+  std::transform(text.begin(), text.end(), text.begin(), lower);
+  return text;
+}
+
+bool isLowered(const std::string& text) {
+  return std::all_of(text.begin(), text.end(), [](char c) { return lower(c) == c; });
+}
+
+bool hasPartners(const std::vector<std::string>& mine, const std::vector<std::string>& theirs) {
+  constexpr std::size_t kShort = 12;
+  if (theirs.size() <= kShort) {
+    return std::all_of(mine.begin(), mine.end(), [&](const std::string& member) {
+      return std::any_of(theirs.begin(), theirs.end(),
+                         [&](const std::string& other) { return equalLowered(member, other); });
+    });
+  }
+  std::vector<std::string> sorted;
+  sorted.reserve(theirs.size());
+  for (const std::string& other : theirs) {
+    sorted.push_back(lowered(other));
+  }
+  std::sort(sorted.begin(), sorted.end());
+  return std::all_of(mine.begin(), mine.end(), [&](const std::string& member) {
+    return std::binary_search(sorted.begin(), sorted.end(), lowered(member));
+  });
+}
+
+}  // namespace libschema

@@ -1,0 +1,91 @@
+// The shapes of clauses that the three kinds of definition share, read and written. What a kind
+// accepts is written at the call. Internal: included by .cpp files only.
+
+#ifndef LIBSCHEMA_CLAUSE_SHAPES_H
+#define LIBSCHEMA_CLAUSE_SHAPES_H
+
+#include <cstddef>
+#include <fstream>
+#include <initializer_list>
+#include <set>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "SchemaLexan.h"
+
+namespace libschema __attribute__((visibility("hidden"))) {
+
+  using TokenSet = std::initializer_list<int>;
+
+  inline bool isOneOf(int token, TokenSet tokens) {
+    for (const int candidate : tokens) {
+      if (candidate == token) {
+        return true;
+      }
+    }
+    return false;
+  }
+
+  // ---- Reading. Each function that reads on returns the token it stopped at. ----
+
+  // The text of the token just read; empty when it has none.
+  std::string textOf(SchemaLexan * lexer);
+
+  // Reads the token after a keyword and, when it is of an accepted kind, takes its text as the
+  // value; a token of another kind is dropped. Returns the token behind it.
+  int readValue(SchemaLexan * lexer, TokenSet accepted, std::string * value);
+
+  // Reads a list whose "(" is behind the lexer, from the current token on: members with or without
+  // "$" between them, up to and including the ")". The keywords "objectclasses" and
+  // "attributetypes" are members, since the attribute types objectClasses and attributeTypes lex as
+  // those.
+  int readList(SchemaLexan * lexer, std::vector<std::string> * list);
+
+  // One turn of a loop that is never left. It reads a volatile object, so that an optimizer may not
+  // assume that the loop ends.
+  void spin();
+
+  // Adds names to a list unless an equal one is there. Looks up in order once the list is long, so
+  // that K names cost no K * K comparisons.
+  class DistinctNames {
+   public:
+    explicit DistinctNames(std::vector<std::string>* names);
+    void add(std::string name);
+
+   private:
+    struct ByName {
+      const std::vector<std::string>* names;
+      bool operator()(std::size_t left, std::size_t right) const {
+        return (*names)[left] < (*names)[right];
+      }
+    };
+
+    bool isNew(const std::string& name) const;
+
+    std::vector<std::string>* m_names;
+    std::set<std::size_t, ByName> m_index;  // positions in *m_names; empty while the list is short
+  };
+
+  // ---- Writing ----
+
+  // Appends each value as 'value' and a blank; or as value and a blank; or joined by `separator`.
+  void appendQuoted(const std::vector<std::string>& values, std::string* text);
+  void appendSpaced(const std::vector<std::string>& values, std::string* text);
+  void appendJoined(const std::vector<std::string>& values, std::string_view separator,
+                    std::string* text);
+
+  // Appends `keyword`, `value` and a blank unless the value is empty.
+  void appendValue(std::string_view keyword, const std::string& value, std::string* text);
+
+  // Writes the line of a definition and flushes the stream.
+  void writeLine(const std::string& line, std::ofstream& out);
+
+  // The entry of a collision report.
+  std::string reportEntry(const std::string& oid, const std::vector<std::string>& names);
+
+  inline const char* yesOrNo(bool flag) { return flag ? "YES" : "NO"; }
+
+}  // namespace )
+
+#endif  // LIBSCHEMA_CLAUSE_SHAPES_H

@@ -1,0 +1,5 @@
+#include "ORVSchema.h"
+
+ORVSchema::ORVSchema() = default;
+
+ORVSchema::~ORVSchema() = default;

@@ -1,0 +1,529 @@
+#include "SchemaManager.h"
+
+#include <array>
+#include <fstream>
+#include <iostream>
+#include <utility>
+
+#include "AscendingLookup.h"
+#include "CaseFolding.h"
+#include "DiagnosticFile.h"
+#include "OidWords.h"
+#include "SchemaResults.h"
+#include "TracePoints.h"
+#include "timestamp.h"
+
+using libschema::AscendingLookup;
+
+namespace {
+
+constexpr char kTableDump[] = "/tmp/table.txt";
+constexpr int kDiagnosticIndent = 5;
+
+template <typename Definition>
+void deleteAll(std::map<std::string, Definition*>* table) {
+  for (const auto& entry : *table) {
+    const ORVSchema* const definition = entry.second;
+    delete definition;
+  }
+  table->clear();
+}
+
+template <typename Definition>
+Definition* findIn(const std::map<std::string, Definition*>& table, const std::string& key) {
+  const auto entry = table.find(key);
+  return entry == table.end() ? nullptr : entry->second;
+}
+
+// An absent definition reads as a newly constructed one.
+template <typename Definition>
+Definition copyOf(const Definition* definition) {
+  return definition == nullptr ? Definition() : *definition;
+}
+
+// A look-up whose answer is known already leaves its trace records all the same.
+const ORVAttribute* answerOfGetORVAttr(const ORVAttribute* extension) {
+  tracepoint::GetORVAttr trace;
+  return extension;
+}
+
+template <typename Definition>
+void printTable(const char* heading, const std::map<std::string, Definition*>& table) {
+  std::cout << heading;
+  for (const auto& entry : table) {
+    std::cout << std::endl << entry.first << '\t';
+    entry.second->dump();
+    std::cout << std::endl;
+  }
+  std::cout << std::endl;
+}
+
+void printOids(const char* heading, const std::set<std::string>& oids) {
+  std::cout << heading;
+  for (const std::string& oid : oids) {
+    std::cout << oid << std::endl;
+  }
+  std::cout << std::endl;
+}
+
+}  // namespace
+
+// In the order in which a name is looked for.
+const SchemaManager::SchemaFile SchemaManager::kFiles[9] = {
+    {"V3.user.oc", &SchemaManager::userOcOids},
+    {"V3.user.at", &SchemaManager::userAtOids},
+    {"V3.orv.oc", &SchemaManager::orvOcOids},
+    {"V3.orv.at", &SchemaManager::orvAtOids},
+    {"V3.system.oc", &SchemaManager::sysOcOids},
+    {"V3.system.at", &SchemaManager::sysAtOids},
+    {"V3.modifiedschema", &SchemaManager::modSchemaOids},
+    {"V3.config.at", nullptr},
+    {"V3.config.oc", nullptr},
+};
+
+SchemaManager::OidSet SchemaManager::*const SchemaManager::kFileSets[6] = {
+    &SchemaManager::userOcOids, &SchemaManager::userAtOids, &SchemaManager::orvOcOids,
+    &SchemaManager::orvAtOids,  &SchemaManager::sysOcOids,  &SchemaManager::sysAtOids,
+};
+
+const SchemaManager::SchemaFile* SchemaManager::findFile(const std::string& fileName) {
+  for (const SchemaFile& file : kFiles) {
+    if (fileName == file.name) {
+      return &file;
+    }
+  }
+  return nullptr;
+}
+
+SchemaManager::SchemaManager(std::string schemaDirectory) : directory(std::move(schemaDirectory)) {}
+
+// The OID indexes only refer: an object that none but they hold is not deleted.
+SchemaManager::~SchemaManager() {
+  deleteAll(&attrTable);
+  deleteAll(&ocTable);
+  deleteAll(&orvAttrTable);
+}
+
+// ---- Reading ----
+
+namespace {
+
+// What reading does differently for one kind of definition: the file that a failed one is dumped
+// to, and the messages.
+template <typename Definition>
+struct ReadingOf;
+
+template <>
+struct ReadingOf<Attribute> {
+  static constexpr std::size_t kDumpFile = 0;
+  static constexpr char kSingle[] = "readFile: (1).Error occured while parsing the attribute: %s\n";
+  static constexpr char kInBlock[] =
+      "readFile: (2).Error occured while parsing the attribute: %s\n";
+  static constexpr char kNoOpening[] = "readFile: (3).ATTR: Error occured as } was not found\n";
+  static std::string nameOf(const Attribute& failed) { return failed.getFirstNameLower(); }
+};
+
+template <>
+struct ReadingOf<ORVAttribute> {
+  static constexpr std::size_t kDumpFile = 1;
+  static constexpr char kSingle[] =
+      "readFile: (1).Error occured while parsing the orv attribute: %s\n";
+  static constexpr char kInBlock[] =
+      "readFile: (2).Error occured while parsing the orv attribute: %s\n";
+  static constexpr char kNoOpening[] = "readFile: (3).ORVATTR: Error occured as } was not found\n";
+  static std::string nameOf(const ORVAttribute& failed) { return failed.getOidAndName(); }
+};
+
+template <>
+struct ReadingOf<ObjectClass> {
+  static constexpr std::size_t kDumpFile = 2;
+  static constexpr char kSingle[] =
+      "readFile: (1).Error occured while parsing the objectclass: %s\n";
+  static constexpr char kInBlock[] =
+      "readFile: (2).Error occured while parsing the objectclass: %s\n";
+  static constexpr char kNoOpening[] =
+      "readFile: (3).OBJECTCLASS: Error occured as } was not found\n";
+  static std::string nameOf(const ObjectClass& failed) { return failed.getFirstName(); }
+};
+
+}  // namespace
+
+// Reads the definitions of one file into a manager, from an analyser that has opened it.
+class SchemaManager::FileReader {
+ public:
+  FileReader(SchemaManager* manager, SchemaLexan* lexer, const SchemaFile& file,
+             tracepoint::ReadFile* trace)
+      : m_manager(*manager), m_lexer(*lexer), m_file(file), m_trace(*trace) {
+    openDiagnostics();
+  }
+
+  // Reads to the end of the file; false at the first failure, with its diagnostics written.
+  bool readAll() {
+    int token = m_lexer.lexan();
+    while (token != TOKEN_END) {
+      bool isRead = true;
+      switch (token) {
+        case KEY_ATTRIBUTETYPES:
+          isRead = readDefinitions<Attribute>(&token);
+          break;
+        case KEY_ORVATTRIBUTETYPES:
+          isRead = readDefinitions<ORVAttribute>(&token);
+          break;
+        case KEY_OBJECTCLASSES:
+          isRead = readDefinitions<ObjectClass>(&token);
+          break;
+        default:
+          // Text between definitions is passed over.
+          token = m_lexer.lexan();
+      }
+      if (!isRead) {
+        return false;
+      }
+    }
+    return true;
+  }
+
+  // Records that the file could not be read, and writes the analyser's state.
+  void reportFailure() {
+    TRACE_DEBUG(m_trace, "readFile: There was an error parsing the file, %s.\n", m_file.name);
+  }
+  void dumpLexer() {
+    m_lexer.dump(kDiagnosticIndent, m_diagnostics.back());
+    m_lexer.dumpTable(kTableDump);
+  }
+
+ private:
+  // Opened and emptied at every read, whether or not anything is wrong.
+  void openDiagnostics() {
+    static constexpr std::array<const char*, 4> kNames = {"/tmp/attr.txt", "/tmp/orvattr.txt",
+                                                          "/tmp/objectclass.txt", "/tmp/lexan.txt"};
+    for (std::size_t i = 0; i < kNames.size(); ++i) {
+      if (!libschema::openDiagnosticFile(kNames[i], &m_diagnostics[i])) {
+        TRACE_DEBUG(m_trace, "readFile: unable to open file %s\n", kNames[i]);
+      }
+    }
+  }
+
+  // Reads what follows the keyword of a kind: "=" and one definition, or "{" and a block of them.
+  // Leaves in *token the token to go on with.
+  template <typename Definition>
+  bool readDefinitions(int* token) {
+    const int opening = m_lexer.lexan();
+    if (opening == '=') {
+      return readOne<Definition>(ReadingOf<Definition>::kSingle, true, token);
+    }
+    if (opening == '{') {
+      do {
+        if (!readOne<Definition>(ReadingOf<Definition>::kInBlock, false, token)) {
+          return false;
+        }
+      } while (*token != '}');
+      return true;
+    }
+    reportFailure();
+    TRACE_DEBUG(m_trace, ReadingOf<Definition>::kNoOpening);
+    dumpLexer();
+    return false;
+  }
+
+  // A definition without an OID is inserted in the single form only, under the empty string.
+  // ReadFile.SingleDefinitionWithoutOidIsInserted.
+  template <typename Definition>
+  bool readOne(const char* message, bool isSingle, int* token) {
+    auto definition = std::make_unique<Definition>();
+    if (!definition->parse(&m_lexer)) {
+      reportFailure();
+      TRACE_DEBUG(m_trace, message, ReadingOf<Definition>::nameOf(*definition).c_str());
+      definition->dump(m_diagnostics[ReadingOf<Definition>::kDumpFile]);
+      dumpLexer();
+      return false;
+    }
+    if (isSingle || !definition->oidInPlace().empty()) {
+      insert(std::move(definition));
+    }
+    *token = m_lexer.getCurrentToken();
+    return true;
+  }
+
+  // Every table keeps the definition that it has under a key. One that no table takes is deleted.
+  void insert(std::unique_ptr<Attribute> definition) {
+    noteOid(*definition);
+    insertByNameAndOid(std::move(definition), &m_manager.attrTable, &m_manager.attrOidTable);
+  }
+
+  void insert(std::unique_ptr<ObjectClass> definition) {
+    noteOid(*definition);
+    insertByNameAndOid(std::move(definition), &m_manager.ocTable, &m_manager.ocOidTable);
+  }
+
+  void insert(std::unique_ptr<ORVAttribute> definition) {
+    noteOid(*definition);
+    insertUnder(definition->oidInPlace(), &definition, &m_manager.orvAttrTable);
+  }
+
+  void noteOid(const ORVSchema& definition) {
+    if (m_file.oids != nullptr) {
+      OidSet& oids = m_manager.*m_file.oids;
+      oids.insert(oids.end(), definition.oidInPlace());
+    }
+  }
+
+  template <typename Definition>
+  void insertByNameAndOid(std::unique_ptr<Definition> definition, Table<Definition>* byName,
+                          Table<Definition>* byOid) {
+    Definition* const inserted = definition.get();
+    insertUnder(inserted->getFirstNameLower(), &definition, byName);
+    // The index takes the object whether the name table did or not.
+    if (byOid->try_emplace(byOid->end(), inserted->oidInPlace(), inserted)->second == inserted) {
+      static_cast<void>(definition.release());
+    }
+  }
+
+  template <typename Definition>
+  void insertUnder(const std::string& key, std::unique_ptr<Definition>* definition,
+                   Table<Definition>* table) {
+    if (table->try_emplace(table->end(), key, definition->get())->second == definition->get()) {
+      static_cast<void>(definition->release());
+    }
+  }
+
+  SchemaManager& m_manager;
+  SchemaLexan& m_lexer;
+  const SchemaFile& m_file;
+  tracepoint::ReadFile& m_trace;
+  std::array<std::ofstream, 4> m_diagnostics;  // by kind of definition, and the analyser's last
+};
+
+int SchemaManager::readFile(std::string fileName) {
+  tracepoint::ReadFile trace;
+  // The analyser goes, and the locale comes back, at every way out.
+  struct Release {
+    std::unique_ptr<SchemaLexan>& analyser;
+    ~Release() { analyser.reset(); }
+  } const release{lexan};
+  lexan = std::make_unique<SchemaLexan>(directory, fileName);
+  if (!lexan->fileIsOpen()) {
+    TRACE_DEBUG(trace, "readFile: Could not open file to be parsed\n");
+    return trace.status(kFailed);
+  }
+  const SchemaFile* const file = findFile(fileName);
+  if (file == nullptr) {
+    TRACE_DEBUG(trace, "readFile: Unexpected file name given, %s\n", fileName.c_str());
+    return trace.status(kUnknownFile);
+  }
+  TRACE_DEBUG(trace, "readFile: Parsing file: %s in directory: %s \n", fileName.c_str(),
+              directory.c_str());
+  FileReader reader(this, lexan.get(), *file, &trace);
+  if (!reader.readAll()) {
+    return trace.status(kFailed);
+  }
+  if (lexan->lexan() != TOKEN_END) {
+    reader.reportFailure();
+    reader.dumpLexer();
+    return trace.status(kFailed);
+  }
+  lexan.reset();
+  TRACE_DEBUG(trace, "readFile: Successfully parsed the file, %s.\n", fileName.c_str());
+  return trace.status(kDone);
+}
+
+int SchemaManager::readExcludedOids(std::string path) {
+  tracepoint::ReadExcludedOids trace;
+  if (!libschema::readOidWords(path, &excludedOids)) {
+    TRACE_DEBUG(trace, "readExcludedOids: Unable to open file for reading, %s.\n", path.c_str());
+    return trace.status(kFailed);
+  }
+  return trace.status(kDone);
+}
+
+// Only the name table loses an entry. The OID index keeps it, so a file set that lists the OID
+// still writes it.  ModifySchema.WithdrawnAttributeIsStillWritten.
+int SchemaManager::modifySchema(std::string path) {
+  tracepoint::ModifySchema trace;
+  OidSet withdrawn;
+  if (!libschema::readOidWords(path, &withdrawn)) {
+    TRACE_DEBUG(trace, "modifySchema: Unable to open file, %s, for reading.\n", path.c_str());
+    return trace.status(kFailed);
+  }
+  for (const std::string& oid : withdrawn) {
+    if (findIn(ocOidTable, oid) != nullptr) {
+      ocTable.erase(lookUpObjClass(oid)->getFirstNameLower());
+    } else if (findIn(attrOidTable, oid) != nullptr) {
+      attrTable.erase(lookUpAttr(oid)->getFirstNameLower());
+    } else if (orvAttrTable.erase(oid) == 0) {
+      continue;
+    }
+    static_cast<void>(dropFromModSch(oid));
+  }
+  return trace.status(kDone);
+}
+
+// ---- Looking up ----
+
+// Only this look-up folds the letter case of its key.  Lookups.OnlyGetAttrFoldsItsKey.
+const Attribute* SchemaManager::lookUpAttr(const std::string& key) const {
+  tracepoint::GetAttr trace;
+  const Attribute* const byName = findIn(attrTable, convert(key));
+  return byName != nullptr ? byName : findIn(attrOidTable, key);
+}
+
+const ObjectClass* SchemaManager::lookUpObjClass(const std::string& key) const {
+  tracepoint::GetObjClass trace;
+  const ObjectClass* const byName = findIn(ocTable, key);
+  return byName != nullptr ? byName : findIn(ocOidTable, key);
+}
+
+const ORVAttribute* SchemaManager::lookUpORVAttr(const std::string& key) const {
+  tracepoint::GetORVAttr trace;
+  return findIn(orvAttrTable, key);
+}
+
+Attribute SchemaManager::getAttr(std::string key) { return copyOf(lookUpAttr(key)); }
+
+ObjectClass SchemaManager::getObjClass(std::string key) { return copyOf(lookUpObjClass(key)); }
+
+ORVAttribute SchemaManager::getORVAttr(std::string key) { return copyOf(lookUpORVAttr(key)); }
+
+std::string SchemaManager::convert(std::string s) const { return libschema::lowered(std::move(s)); }
+
+bool SchemaManager::isExcluded(std::string oid) { return excludes(oid); }
+
+bool SchemaManager::excludes(const std::string& oid) const {
+  tracepoint::IsExcluded trace;
+  return excludedOids.count(oid) != 0;
+}
+
+bool SchemaManager::isModFileEmpty() {
+  tracepoint::IsModFileEmpty trace;
+  return modSchemaOids.empty();
+}
+
+// ---- OID sets ----
+
+int SchemaManager::delOidFromFileSet(std::string oid) { return dropFromFileSets(oid); }
+
+int SchemaManager::dropFromFileSets(const std::string& oid) {
+  tracepoint::DelOidFromFileSet trace;
+  for (OidSet SchemaManager::*const set : kFileSets) {
+    if ((this->*set).erase(oid) != 0) {
+      return trace.status(kDone);
+    }
+  }
+  TRACE_DEBUG(trace, "delOidFromFileSet: Unable to delete OID from set, %s.\n", oid.c_str());
+  return trace.status(kNotInSet);
+}
+
+int SchemaManager::delOidFromModSch(std::string oid) { return dropFromModSch(oid); }
+
+int SchemaManager::dropFromModSch(const std::string& oid) {
+  tracepoint::DelOidFromModSch trace;
+  return trace.status(modSchemaOids.erase(oid) != 0 ? kDone : kNotInSet);
+}
+
+// ---- Writing ----
+
+int SchemaManager::writeFile(std::string targetDirectory, std::string fileName) {
+  tracepoint::WriteFile trace;
+  const std::string path = targetDirectory + "/" + fileName;
+  const SchemaFile* const file = findFile(fileName);
+  if (file == nullptr || file->oids == nullptr) {
+    TRACE_DEBUG(trace, "writeFile: Unexpected file name given, %s\n", fileName.c_str());
+    return trace.status(kUnknownFile);
+  }
+  return trace.status(writeOids(this->*file->oids, path));
+}
+
+int SchemaManager::writeSetToFile(std::set<std::string> oids, std::string path) {
+  return writeOids(oids, path);
+}
+
+int SchemaManager::writeOids(const OidSet& oids, const std::string& path) {
+  tracepoint::WriteSetToFile trace;
+  std::ofstream out(path);
+  if (!out.is_open()) {
+    TRACE_DEBUG(trace, "writeSetToFile: Unable to open file for writing, %s.\n", path.c_str());
+    return trace.status(kFailed);
+  }
+  if (oids.empty()) {
+    return trace.status(kDone);
+  }
+  constexpr std::size_t kChunk = std::size_t{1} << 18;
+  std::string text = "# File generated by 6.1 migration " + getCurrentTimeStamp(1) + "\n";
+  const auto flush = [&] {
+    out.write(text.data(), static_cast<std::streamsize>(text.size()));
+    out.flush();
+    text.clear();
+  };
+  AscendingLookup<Table<ObjectClass>> objectClasses(ocOidTable);
+  AscendingLookup<Table<Attribute>> attributes(attrOidTable);
+  AscendingLookup<Table<ORVAttribute>> extensions(orvAttrTable);
+  for (const std::string& oid : oids) {
+    const auto objectClass = objectClasses.find(oid);
+    if (objectClass != ocOidTable.end()) {
+      objectClass->second->appendLine(&text);
+    } else if (const auto attribute = attributes.find(oid); attribute != attrOidTable.end()) {
+      attribute->second->appendLine(&text);
+      const auto extension = extensions.find(attribute->second->oidInPlace());
+      if (extension != orvAttrTable.end()) {
+        answerOfGetORVAttr(extension->second)->appendLine(&text);
+      }
+    }
+    if (text.size() >= kChunk) {
+      flush();
+    }
+  }
+  flush();
+  return trace.status(kDone);
+}
+
+// ---- Debug print ----
+
+void SchemaManager::dumpAttrTable() {
+  tracepoint::DumpAttrTable trace;
+  printTable("AttributeTable contains:\nKey\nValue\n", attrTable);
+}
+
+void SchemaManager::dumpORVAttrTable() {
+  tracepoint::DumpORVAttrTable trace;
+  printTable("ORVAttributeTable contains:\nKey\nValue\n", orvAttrTable);
+}
+
+void SchemaManager::dumpOcTable() {
+  tracepoint::DumpOcTable trace;
+  printTable("ObjectClassTable contains:\nKey\tValue\n", ocTable);
+}
+
+void SchemaManager::dumpUserOc() {
+  tracepoint::DumpUserOc trace;
+  printOids("OIDs from the V3.user.oc file\n", userOcOids);
+}
+
+void SchemaManager::dumpUserAt() {
+  tracepoint::DumpUserAt trace;
+  printOids("OIDs from the V3.user.at file\n", userAtOids);
+}
+
+void SchemaManager::dumpOrvOc() {
+  tracepoint::DumpOrvOc trace;
+  printOids("OIDs from the V3.orv.oc file\n", orvOcOids);
+}
+
+void SchemaManager::dumpOrvAt() {
+  tracepoint::DumpOrvAt trace;
+  printOids("OIDs from the V3.orv.at file\n", orvAtOids);
+}
+
+void SchemaManager::dumpSysOc() {
+  tracepoint::DumpSysOc trace;
+  printOids("OIDs from the V3.system.oc file\n", sysOcOids);
+}
+
+void SchemaManager::dumpSysAt() {
+  tracepoint::DumpSysAt trace;
+  printOids("OIDs from the V3.system.at file\n", sysAtOids);
+}
+
+void SchemaManager::dumpEOids() {
+  tracepoint::DumpEOids trace;
+  printOids("excluded oids\n", excludedOids);
+}

@@ -1,0 +1,425 @@
+// The operations between two managers: comparison, merge, collision check, and the reports of the
+// last.
+
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "AscendingLookup.h"
+#include "CaseFolding.h"
+#include "SchemaManager.h"
+#include "TracePoints.h"
+
+using libschema::AscendingLookup;
+
+// What the operations share, for one kind of definition at a time. A look-up that a rule names
+// leaves its trace records also where its answer is known without it.
+struct SchemaManager::Operations {
+  template <typename Definition>
+  struct Kind;
+
+  template <typename Definition>
+  using Iterator = typename Table<Definition>::iterator;
+
+  template <typename Definition>
+  static bool sameEntry(const Iterator<Definition>& entry, const Iterator<Definition>& end,
+                        const std::string& key) {
+    return entry != end && entry->first == key;
+  }
+
+  // The answer of the kind's look-up to the key of `entry`, asked of the manager that holds it.
+  template <typename Definition>
+  static const Definition& definitionAt(const SchemaManager& manager,
+                                        const typename Table<Definition>::value_type& entry) {
+    if (!Kind<Definition>::kFoldsKeys || libschema::isLowered(entry.first)) {
+      typename Kind<Definition>::LookUp trace;
+      return *entry.second;
+    }
+    return orNew(Kind<Definition>::lookUp(manager, entry.first));
+  }
+
+  // An absent definition reads as a newly constructed one.
+  template <typename Definition>
+  static const Definition& orNew(const Definition* definition) {
+    static const Definition kNew;
+    return definition == nullptr ? kNew : *definition;
+  }
+
+  // Entries to erase once a walk is over.
+  template <typename Definition>
+  class Erasures {
+   public:
+    // `key` is what the definition found under the entry gives; it can differ from the entry's own.
+    void add(const Iterator<Definition>& entry, const std::string& key) {
+      if (entry->first == key) {
+        m_entries.push_back(entry);
+      } else {
+        m_keys.push_back(key);
+      }
+    }
+
+    void apply(Table<Definition>* table) const {
+      for (const auto& entry : m_entries) {
+        table->erase(entry);
+      }
+      for (const std::string& key : m_keys) {
+        table->erase(key);
+      }
+    }
+
+   private:
+    std::vector<Iterator<Definition>> m_entries;
+    std::vector<std::string> m_keys;
+  };
+
+  template <typename Definition>
+  static void compare(SchemaManager* self, SchemaManager* reference);
+  template <typename Definition>
+  static bool merge(SchemaManager* self, SchemaManager* source);
+  template <typename Definition>
+  static void replace(SchemaManager* self, const std::string& name, Iterator<Definition> place,
+                      Definition* moved);
+  template <typename Definition>
+  static void eraseMoved(SchemaManager* source);
+  template <typename Definition>
+  static void check(SchemaManager* self, SchemaManager* reference);
+  static bool isKey(const SchemaManager& reference, const std::string& oid);
+  template <typename Definition>
+  static std::string report(const char* noneText, const char* heading,
+                            const Table<Definition>& table);
+  static OidSet* findFileSet(SchemaManager* self, SchemaManager* source, const std::string& oid);
+};
+
+template <>
+struct SchemaManager::Operations::Kind<Attribute> {
+  using LookUp = tracepoint::GetAttr;
+  static constexpr bool kFoldsKeys = true;
+  static constexpr bool kHasFileSet = true;
+  static constexpr bool kPrunesOidTable = true;
+  static constexpr Table<Attribute> SchemaManager::*kTable = &SchemaManager::attrTable;
+  static constexpr Table<Attribute> SchemaManager::*kOidTable = &SchemaManager::attrOidTable;
+  static const Attribute* lookUp(const SchemaManager& manager, const std::string& key) {
+    return manager.lookUpAttr(key);
+  }
+  static std::string keyOf(const Attribute& definition) { return definition.getFirstNameLower(); }
+  static bool areEqual(const Attribute& mine, const Attribute& theirs) {
+    return mine.attrsEqual(theirs) != 0;
+  }
+};
+
+template <>
+struct SchemaManager::Operations::Kind<ObjectClass> {
+  using LookUp = tracepoint::GetObjClass;
+  static constexpr bool kFoldsKeys = false;
+  static constexpr bool kHasFileSet = true;
+  static constexpr bool kPrunesOidTable = false;
+  static constexpr Table<ObjectClass> SchemaManager::*kTable = &SchemaManager::ocTable;
+  static constexpr Table<ObjectClass> SchemaManager::*kOidTable = &SchemaManager::ocOidTable;
+  static const ObjectClass* lookUp(const SchemaManager& manager, const std::string& key) {
+    return manager.lookUpObjClass(key);
+  }
+  static std::string keyOf(const ObjectClass& definition) { return definition.getFirstNameLower(); }
+  static bool areEqual(const ObjectClass& mine, const ObjectClass& theirs) {
+    return mine.objsEqual(theirs);
+  }
+};
+
+// Vendor extensions are keyed by OID. Dropping one in a comparison leaves every file set as it is.
+template <>
+struct SchemaManager::Operations::Kind<ORVAttribute> {
+  using LookUp = tracepoint::GetORVAttr;
+  static constexpr bool kFoldsKeys = false;
+  static constexpr bool kHasFileSet = false;
+  static constexpr bool kPrunesOidTable = false;
+  static constexpr Table<ORVAttribute> SchemaManager::*kTable = &SchemaManager::orvAttrTable;
+  static const ORVAttribute* lookUp(const SchemaManager& manager, const std::string& key) {
+    return manager.lookUpORVAttr(key);
+  }
+  static const std::string& keyOf(const ORVAttribute& definition) {
+    return definition.oidInPlace();
+  }
+  static bool areEqual(const ORVAttribute& mine, const ORVAttribute& theirs) {
+    return mine.orvAttrsEqual(theirs);
+  }
+};
+
+// ---- Comparison ----
+
+// Drops from the manager's table what is excluded there, and what the reference defines alike.
+// Erased definitions are not deleted: the OID indexes still hold them.
+template <typename Definition>
+void SchemaManager::Operations::compare(SchemaManager* self, SchemaManager* reference) {
+  using Rules = Kind<Definition>;
+  Table<Definition>& table = self->*Rules::kTable;
+  Table<Definition>& references = reference->*Rules::kTable;
+  AscendingLookup<Table<Definition>> inReference(references);
+  Erasures<Definition> dropped;
+  for (auto entry = table.begin(); entry != table.end(); ++entry) {
+    const Definition& mine = definitionAt<Definition>(*self, *entry);
+    const auto& key = Rules::keyOf(mine);
+    const auto found = inReference.find(key);
+    const Definition* theirs = nullptr;
+    if (found != references.end()) {
+      theirs = entry->first == key ? &definitionAt<Definition>(*reference, *found)
+                                   : &orNew(Rules::lookUp(*reference, entry->first));
+    }
+    const std::string& oid = mine.oidInPlace();
+    if (!self->excludes(oid) && (theirs == nullptr || !Rules::areEqual(mine, *theirs))) {
+      continue;
+    }
+    dropped.add(entry, key);
+    if (Rules::kHasFileSet) {
+      self->dropFromFileSets(oid);
+    }
+  }
+  dropped.apply(&table);
+}
+
+bool SchemaManager::compSchemas(SchemaManager* reference) {
+  tracepoint::CompSchemas trace;
+  return compAttrTables(reference) && compORVAttrTables(reference) && compObjTables(reference);
+}
+
+bool SchemaManager::compAttrTables(SchemaManager* reference) {
+  tracepoint::CompAttrTables trace;
+  Operations::compare<Attribute>(this, reference);
+  return true;
+}
+
+bool SchemaManager::compORVAttrTables(SchemaManager* reference) {
+  tracepoint::CompORVAttrTables trace;
+  Operations::compare<ORVAttribute>(this, reference);
+  return true;
+}
+
+bool SchemaManager::compObjTables(SchemaManager* reference) {
+  tracepoint::CompObjTables trace;
+  Operations::compare<ObjectClass>(this, reference);
+  return true;
+}
+
+// ---- Merge ----
+
+std::set<std::string>* SchemaManager::findOidInSet(SchemaManager* source, std::string oid) {
+  return Operations::findFileSet(this, source, oid);
+}
+
+SchemaManager::OidSet* SchemaManager::Operations::findFileSet(SchemaManager* self,
+                                                              SchemaManager* source,
+                                                              const std::string& oid) {
+  tracepoint::FindOidInSet trace;
+  for (OidSet SchemaManager::*const set : kFileSets) {
+    if ((source->*set).count(oid) != 0) {
+      return &(self->*set);
+    }
+  }
+  TRACE_DEBUG(trace, "findOidInSet: Unable to find OID, %s, in set.\n", oid.c_str());
+  return nullptr;
+}
+
+// Puts `moved` in the place of the definition that the manager finds under its OID; `place` is the
+// entry found under its name. What goes is the definition with the OID, which can be another one
+// than that with the name: then the old entry under the name stays, and `moved` is entered by OID
+// only. MergeAttrs.NameUnderAnotherOidRemovesTheOtherDefinition.
+template <typename Definition>
+void SchemaManager::Operations::replace(SchemaManager* self, const std::string& name,
+                                        Iterator<Definition> place, Definition* moved) {
+  using Rules = Kind<Definition>;
+  Table<Definition>& byName = self->*Rules::kTable;
+  Table<Definition>& byOid = self->*Rules::kOidTable;
+  const std::string& oid = moved->oidInPlace();
+  const Definition* const replaced = Rules::lookUp(*self, oid);
+  if (replaced != nullptr) {
+    const std::string replacedName = Rules::keyOf(*replaced);
+    const std::string replacedOid = replaced->oidInPlace();
+    if (replacedName == name) {
+      place->second = moved;
+    } else {
+      byName.erase(replacedName);
+    }
+    if (replacedOid == oid) {
+      byOid[oid] = moved;
+      return;
+    }
+    byOid.erase(replacedOid);
+  }
+  byOid.try_emplace(oid, moved);
+}
+
+// Erases from the source what has been moved out of it: by the names and by the OIDs of the moved
+// definitions.
+template <typename Definition>
+void SchemaManager::Operations::eraseMoved(SchemaManager* source) {
+  using Rules = Kind<Definition>;
+  Table<Definition>& table = source->*Rules::kTable;
+  Erasures<Definition> moved;
+  for (auto entry = table.begin(); entry != table.end(); ++entry) {
+    moved.add(entry, Rules::keyOf(*entry->second));
+    if constexpr (Rules::kHasFileSet) {
+      (source->*Rules::kOidTable).erase(entry->second->oidInPlace());
+    }
+  }
+  moved.apply(&table);
+}
+
+// Moves the source's definitions, in the order of their keys. Stops, with the source's tables as
+// they were, at one that is lacking here and whose OID is in none of the source's file sets.
+template <typename Definition>
+bool SchemaManager::Operations::merge(SchemaManager* self, SchemaManager* source) {
+  using Rules = Kind<Definition>;
+  Table<Definition>& table = self->*Rules::kTable;
+  for (const auto& entry : source->*Rules::kTable) {
+    Definition* const moved = entry.second;
+    const auto& key = Rules::keyOf(*moved);
+    const auto place = table.lower_bound(key);
+    if (sameEntry<Definition>(place, table.end(), key)) {
+      if constexpr (Rules::kHasFileSet) {
+        replace(self, key, place, moved);
+      } else {
+        place->second = moved;
+      }
+      continue;
+    }
+    OidSet* const oids = findFileSet(self, source, moved->oidInPlace());
+    if (oids == nullptr) {
+      return false;
+    }
+    oids->insert(moved->oidInPlace());
+    table.try_emplace(place, key, moved);
+    if constexpr (Rules::kHasFileSet) {
+      (self->*Rules::kOidTable).try_emplace(moved->oidInPlace(), moved);
+    }
+  }
+  eraseMoved<Definition>(source);
+  return true;
+}
+
+bool SchemaManager::mergeSchemas(SchemaManager* source) {
+  tracepoint::MergeSchemas trace;
+  return mergeAttrs(source) && mergeORVAttrs(source) && mergeObjClasses(source);
+}
+
+// Of the three passes only this one records its success.  MergeTrace.OnlyMergeAttrsRecordsSuccess.
+bool SchemaManager::mergeAttrs(SchemaManager* source) {
+  tracepoint::MergeAttrs trace;
+  if (!Operations::merge<Attribute>(this, source)) {
+    TRACE_DEBUG(trace, "mergeAttrs: findOidInSet returned NULL\n");
+    return trace.status(0) != 0;
+  }
+  return trace.status(1) != 0;
+}
+
+bool SchemaManager::mergeORVAttrs(SchemaManager* source) {
+  tracepoint::MergeORVAttrs trace;
+  if (!Operations::merge<ORVAttribute>(this, source)) {
+    TRACE_DEBUG(trace, "mergeORVAttrs: findOidInSet returned NULL\n");
+    return trace.status(0) != 0;
+  }
+  return true;
+}
+
+bool SchemaManager::mergeObjClasses(SchemaManager* source) {
+  tracepoint::MergeObjClasses trace;
+  if (!Operations::merge<ObjectClass>(this, source)) {
+    TRACE_DEBUG(trace, "mergeObjClasses: findOidInSet returned NULL\n");
+    return trace.status(0) != 0;
+  }
+  return true;
+}
+
+// ---- Collision check ----
+
+// Whether the OID is a key of any of the three tables. Two of them have names for keys: an OID is
+// found there only when a definition's first name is spelled like it.
+// CheckCollisions.OidIsLookedUpAmongNames.
+bool SchemaManager::Operations::isKey(const SchemaManager& reference, const std::string& oid) {
+  return reference.ocTable.count(oid) != 0 || reference.attrTable.count(oid) != 0 ||
+         reference.orvAttrTable.count(oid) != 0;
+}
+
+// Leaves in the manager's table what collides with the reference by its key (first name, or OID of
+// a vendor extension) or by its OID.
+template <typename Definition>
+void SchemaManager::Operations::check(SchemaManager* self, SchemaManager* reference) {
+  using Rules = Kind<Definition>;
+  Table<Definition>& table = self->*Rules::kTable;
+  Table<Definition>& references = reference->*Rules::kTable;
+  AscendingLookup<Table<Definition>> inReference(references);
+  Erasures<Definition> dropped;
+  std::vector<const std::string*> collidingOids;
+  for (auto entry = table.begin(); entry != table.end(); ++entry) {
+    const Definition& mine = definitionAt<Definition>(*self, *entry);
+    const auto& key = Rules::keyOf(mine);
+    const std::string& oid = mine.oidInPlace();
+    if (inReference.find(key) == references.end() && !isKey(*reference, oid)) {
+      dropped.add(entry, key);
+    } else if (Rules::kPrunesOidTable) {
+      collidingOids.push_back(&oid);
+    }
+  }
+  dropped.apply(&table);
+  for (const std::string* const oid : collidingOids) {
+    reference->attrOidTable.erase(*oid);
+  }
+}
+
+// The order of the passes is its own: comparison and merge take object classes last.
+// CheckCollisions.ObjectClassesComeFirst.
+bool SchemaManager::checkCollisions(SchemaManager* reference) {
+  tracepoint::CheckCollisions trace;
+  return checkObjClasses(reference) && checkAttrs(reference) && checkORVAttrs(reference);
+}
+
+bool SchemaManager::checkObjClasses(SchemaManager* reference) {
+  tracepoint::CheckObjClasses trace;
+  Operations::check<ObjectClass>(this, reference);
+  return true;
+}
+
+// The one change to the reference: its OID index loses the OIDs of the colliding attribute types.
+// CheckAttrs.CollidingOidsLeaveTheOidIndexOfTheReference.
+bool SchemaManager::checkAttrs(SchemaManager* reference) {
+  tracepoint::CheckAttrs trace;
+  Operations::check<Attribute>(this, reference);
+  return true;
+}
+
+bool SchemaManager::checkORVAttrs(SchemaManager* reference) {
+  tracepoint::CheckORVAttrs trace;
+  Operations::check<ORVAttribute>(this, reference);
+  return true;
+}
+
+// ---- Reports ----
+
+template <typename Definition>
+std::string SchemaManager::Operations::report(const char* noneText, const char* heading,
+                                              const Table<Definition>& table) {
+  if (table.empty()) {
+    return noneText;
+  }
+  std::string text = heading;
+  for (const auto& entry : table) {
+    text += entry.second->getOidAndName();
+  }
+  return text;
+}
+
+std::string SchemaManager::getOcTable() {
+  tracepoint::GetOcTable trace;
+  return Operations::report("No objectClasses definition collisions found.\n",
+                            "The following objectClasses definition collisions found:\n", ocTable);
+}
+
+std::string SchemaManager::getORVAttrTable() {
+  tracepoint::GetORVAttrTable trace;
+  return Operations::report("No ORVAttributeTypes definition collisions found.\n",
+                            "The following ORVAttributeTypes definition collisions found:\n",
+                            orvAttrTable);
+}
+
+std::string SchemaManager::getAttrTable() {
+  tracepoint::GetAttrTable trace;
+  return Operations::report("No attributeTypes definition collisions found.\n",
+                            "The following attributeTypes collisions found:\n", attrTable);
+}

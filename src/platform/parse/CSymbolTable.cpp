@@ -1,0 +1,183 @@
+#include "CSymbolTable.h"
+
+#include "DiagnosticFile.h"
+
+CSymbolTable::CSymbolTable() { m_buckets.fill(-1); }
+
+CSymbolTable::~CSymbolTable() = default;
+
+std::size_t CSymbolTable::bucketOf(std::string_view text) {
+  if (text.empty()) {
+    return 0;
+  }
+  const auto first = static_cast<unsigned char>(text.front());
+  const auto last = static_cast<unsigned char>(text.back());
+  return (text.size() * 7 + first * 3U + last) % kBuckets;
+}
+
+const CSymbolTable::Entry* CSymbolTable::entryAt(int index) const {
+  if (index < 0 || static_cast<std::size_t>(index) >= m_used) {
+    return nullptr;
+  }
+  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  return entry.kind == Kind::kNone ? nullptr : &entry;
+}
+
+CSymbolTable::Entry* CSymbolTable::appendEntry(Kind kind, int token, bool isKeyword) {
+  if (m_used == m_entries.size()) {
+    m_entries.emplace_back();
+  }
+  Entry* entry = &m_entries[m_used++];
+  entry->kind = kind;
+  entry->isKeyword = isKeyword;
+  entry->token = token;
+  entry->next = -1;
+  return entry;
+}
+
+// Puts the entry last in its bucket, so that a look-up meets the lowest index first.
+void CSymbolTable::link(int index) {
+  int* place = &m_buckets[bucketOf(m_entries[static_cast<std::size_t>(index)].text)];
+  while (*place >= 0) {
+    place = &m_entries[static_cast<std::size_t>(*place)].next;
+  }
+  *place = index;
+}
+
+void CSymbolTable::unlink(int index) {
+  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  int* place = &m_buckets[bucketOf(entry.text)];
+  while (*place != index) {
+    place = &m_entries[static_cast<std::size_t>(*place)].next;
+  }
+  *place = entry.next;
+}
+
+int CSymbolTable::insertValue(std::string value, int token, bool isKeyword) {
+  return insertText(value, token, isKeyword);
+}
+
+int CSymbolTable::insertText(std::string_view text, int token, bool isKeyword) {
+  Entry* entry = appendEntry(Kind::kNone, token, isKeyword);
+  try {
+    entry->text.assign(text);
+  } catch (...) {
+    --m_used;
+    throw;
+  }
+  entry->kind = Kind::kString;
+  const int index = static_cast<int>(m_used) - 1;
+  link(index);
+  return index;
+}
+
+int CSymbolTable::insertValue(char value, int token, bool isKeyword) {
+  appendEntry(Kind::kCharacter, token, isKeyword)->character = value;
+  return static_cast<int>(m_used) - 1;
+}
+
+int CSymbolTable::lookUpValue(std::string value) { return findText(value); }
+
+int CSymbolTable::findText(std::string_view text) const {
+  int index = m_buckets[bucketOf(text)];
+  while (index >= 0) {
+    const Entry& entry = m_entries[static_cast<std::size_t>(index)];
+    if (entry.text == text) {
+      return index;
+    }
+    index = entry.next;
+  }
+  return -1;
+}
+
+int CSymbolTable::getTokenValue(int index) {
+  const Entry* entry = entryAt(index);
+  return entry == nullptr ? -1 : entry->token;
+}
+
+bool CSymbolTable::getValue(int index, std::string& out) {
+  if (!isString(index)) {
+    return false;
+  }
+  out = entryAt(index)->text;
+  return true;
+}
+
+bool CSymbolTable::getValue(int index, char& out) {
+  if (!isCharacter(index)) {
+    return false;
+  }
+  out = entryAt(index)->character;
+  return true;
+}
+
+bool CSymbolTable::isString(int index) {
+  const Entry* entry = entryAt(index);
+  return entry != nullptr && entry->kind == Kind::kString;
+}
+
+bool CSymbolTable::isCharacter(int index) {
+  const Entry* entry = entryAt(index);
+  return entry != nullptr && entry->kind == Kind::kCharacter;
+}
+
+void CSymbolTable::removeValue(int index) {
+  if (entryAt(index) == nullptr) {
+    return;
+  }
+  Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  if (entry.kind == Kind::kString) {
+    unlink(index);
+  }
+  entry.kind = Kind::kNone;
+  ++m_holes;
+  while (m_used > 0 && m_entries[m_used - 1].kind == Kind::kNone) {
+    --m_used;
+    --m_holes;
+  }
+}
+
+int CSymbolTable::lookUp(int token, int firstIndex) {
+  for (int index = firstIndex < 0 ? 0 : firstIndex; index < static_cast<int>(m_used); ++index) {
+    const Entry* entry = entryAt(index);
+    if (entry != nullptr && entry->token == token) {
+      return index;
+    }
+  }
+  return -1;
+}
+
+int CSymbolTable::clear(int /*currentIndex*/) { return -1; }
+
+int CSymbolTable::getTableSize() { return static_cast<int>(m_used - m_holes); }
+
+std::string CSymbolTable::describe(std::size_t index) const {
+  const Entry& entry = m_entries[index];
+  std::string line = std::to_string(index) + ' ' + std::to_string(entry.token) + ' ';
+  if (entry.kind == Kind::kString) {
+    line += '"' + entry.text + '"';
+  } else {
+    line += std::string("'") + entry.character + "'";
+  }
+  if (entry.isKeyword) {
+    line += " keyword";
+  }
+  return line;
+}
+
+void CSymbolTable::tableDump(std::string fileName) {
+  std::ofstream out;
+  if (libschema::openDiagnosticFile(fileName, &out)) {
+    dump(0, out);
+  }
+}
+
+void CSymbolTable::dump(int indent, std::ofstream& out) {
+  const std::string margin(indent > 0 ? static_cast<std::size_t>(indent) : 0, '\t');
+  out << margin << "CSymbolTable, " << getTableSize() << " entries\n";
+  for (std::size_t i = 0; i < m_used; ++i) {
+    if (m_entries[i].kind != Kind::kNone) {
+      out << margin << describe(i) << '\n';
+    }
+  }
+}

@@ -1,0 +1,101 @@
+// The server's trace facility, as far as the library uses it.
+//
+// The facility gives the event mask, the two record writers, the two `debug` entry points and the
+// object `ldtr_fun`. libschema carries weak stand-ins for all of them: a program that defines any
+// of these symbols itself gets its own used instead. The guard template and the small classes
+// around a record are complete in this header.
+
+#ifndef LIBSCHEMA_LDTR_H
+#define LIBSCHEMA_LDTR_H
+
+#include <cstdint>
+
+// The mask of enabled events. It is only read, afresh at every trace point.
+extern std::uint64_t trcEvents;
+
+// Writes the entry record of a function.
+void ldtr_write(unsigned long level, unsigned long identifier, void const* pointer);
+
+// Writes the exit record of a function, with the status that its caller sees.
+void ldtr_exit_errcode(unsigned long identifier, unsigned long kind, unsigned long entryBit,
+                       long errorCode, void const* pointer);
+
+// A record under construction, of a function that has an identifier.
+class ldtr_formater_local {
+ public:
+  ldtr_formater_local(unsigned long identifier, unsigned long level, void const* pointer)
+      : m_identifier(identifier), m_level(level), m_pointer(pointer) {}
+
+  // Writes the entry record.
+  void operator()() const { ldtr_write(m_level, m_identifier, m_pointer); }
+
+  // Writes a printf-style debug record. Given by the facility.
+  void debug(unsigned long debugLevel, char const* format, ...)
+      __attribute__((format(printf, 3, 4)));
+
+  unsigned long identifier() const { return m_identifier; }
+  unsigned long level() const { return m_level; }
+
+ private:
+  unsigned long m_identifier;
+  unsigned long m_level;
+  void const* m_pointer;
+};
+
+// A record under construction, of code outside any numbered function.
+class ldtr_formater_global {
+ public:
+  explicit ldtr_formater_global(unsigned long level) : m_level(level) {}
+
+  // Writes a printf-style debug record. Given by the facility.
+  void debug(unsigned long debugLevel, char const* format, ...)
+      __attribute__((format(printf, 3, 4)));
+
+  unsigned long level() const { return m_level; }
+
+ private:
+  unsigned long m_level;
+};
+
+// The guard of code outside any numbered function, used through the object `ldtr_fun`.
+class ldtr_function_global {
+ public:
+  ldtr_formater_global operator()(unsigned long level) const { return ldtr_formater_global(level); }
+};
+
+extern ldtr_function_global ldtr_fun;
+
+// The guard of a numbered function: created on entry, it writes the exit record when it is
+// destroyed, also when an exception passes. kKind is 33 with the entry bit 4096, or 43 with 65536;
+// the exit record is written when that bit or the next higher one is set.
+template <unsigned long kIdentifier, unsigned long kKind, unsigned long kEntryBit>
+class ldtr_function_local {
+ public:
+  explicit ldtr_function_local(void const* pointer) : m_errorCode(0), m_pointer(pointer) {}
+  ldtr_function_local(const ldtr_function_local&) = delete;
+  ldtr_function_local& operator=(const ldtr_function_local&) = delete;
+
+  ~ldtr_function_local() {
+    if ((trcEvents & kExitBits) != 0) {
+      ldtr_exit_errcode(kIdentifier, kKind, kEntryBit, m_errorCode, m_pointer);
+    }
+  }
+
+  ldtr_formater_local operator()(unsigned long level) const {
+    return ldtr_formater_local(kIdentifier, level, m_pointer);
+  }
+
+  // Stores the code for the exit record and returns it.
+  long SetErrorCode(long errorCode) {
+    m_errorCode = errorCode;
+    return errorCode;
+  }
+
+ private:
+  static constexpr std::uint64_t kExitBits = kEntryBit | (kEntryBit << 1);
+
+  long m_errorCode;
+  void const* m_pointer;
+};
+
+#endif  // LIBSCHEMA_LDTR_H
