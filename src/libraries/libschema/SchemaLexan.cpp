@@ -88,6 +88,7 @@ class Scanner {
   // there.
   bool skipRun(ByteClass byteClass) {
     while (isOf(m_current, byteClass)) {
+      m_next = endOfRun(byteClass);
       if (!read()) {
         return false;
       }
@@ -95,13 +96,14 @@ class Scanner {
     return true;
   }
 
-  // The same, appending them to the text.
+  // Passes over the characters of the class that lie ahead in the window.
+  void passRun(ByteClass byteClass) { m_next = endOfRun(byteClass); }
+
+  // Passes over characters of the class like skipRun, appending them to the text.
   bool takeRun(ByteClass byteClass) {
     while (isOf(m_current, byteClass)) {
       const char* const start = m_next - 1;
-      while (m_next != m_end && isOf(*m_next, byteClass)) {
-        ++m_next;
-      }
+      m_next = endOfRun(byteClass);
       append(start, m_next);
       if (!read()) {
         return false;
@@ -123,6 +125,16 @@ class Scanner {
   void takeWindow() {
     m_start = m_next = BufferAccess::next(*m_buffer);
     m_end = BufferAccess::end(*m_buffer);
+  }
+
+  // The first character of the window, from the next one on, that is not of the class.
+  const char* endOfRun(ByteClass byteClass) const {
+    const char* place = m_next;
+    const char* const end = m_end;
+    while (place != end && isOf(*place, byteClass)) {
+      ++place;
+    }
+    return place;
   }
 
   void giveBack() { BufferAccess::advance(m_buffer, static_cast<int>(m_next - m_start)); }
@@ -286,6 +298,7 @@ int SchemaLexan::nextToken() {
     }
     const char c = scanner.current();
     if (isOf(c, kBlank)) {
+      scanner.passRun(kBlank);
       continue;
     }
     if (c == '\n') {

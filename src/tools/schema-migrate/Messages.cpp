@@ -1,0 +1,60 @@
+#include "Messages.h"
+
+#include <array>
+#include <cstdio>
+#include <cstring>
+
+namespace {
+
+constexpr char kProgram[] = "schema-migrate";
+
+std::string line(const std::string& place, const char* severity, const std::string& text) {
+  return place + ": " + severity + ": " + text + "\n";
+}
+
+}  // namespace
+
+std::string errorLine(const std::string& text) { return line(kProgram, "error", text); }
+
+std::string errorLine(const std::string& place, const std::string& text) {
+  return line(place, "error", text);
+}
+
+std::string warningLine(const std::string& text) { return line(kProgram, "warning", text); }
+
+std::string warningLine(const std::string& place, const std::string& text) {
+  return line(place, "warning", text);
+}
+
+std::string placeOf(const std::string& path, std::uint64_t line) {
+  return path + ":" + std::to_string(line);
+}
+
+std::string placeOf(const std::string& path, const Position& position) {
+  return placeOf(path, position.line) + ":" + std::to_string(position.column);
+}
+
+std::string systemError(int errorNumber) { return std::strerror(errorNumber); }
+
+std::string counted(std::uint64_t count, const std::string& noun) {
+  return std::to_string(count) + " " + noun + (count == 1 ? "" : "s");
+}
+
+std::string printable(const std::string& text) {
+  constexpr std::size_t kLongest = 200;
+  std::string result;
+  for (const char c : text) {
+    if (result.size() >= kLongest) {
+      return result + "...";
+    }
+    const auto byte = static_cast<unsigned char>(c);
+    if (byte >= 0x20 && byte < 0x7f) {
+      result += c;
+    } else {
+      std::array<char, 8> escaped{};
+      std::snprintf(escaped.data(), escaped.size(), "\\x%02X", static_cast<unsigned>(byte));
+      result += escaped.data();
+    }
+  }
+  return result;
+}

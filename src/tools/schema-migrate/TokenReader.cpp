@@ -1,0 +1,223 @@
+#include "TokenReader.h"
+
+#include <libschema/SchemaTokens.h>
+
+#include <array>
+#include <cstddef>
+
+namespace {
+
+constexpr std::size_t kBufferSize = std::size_t{1} << 16;
+
+struct Keyword {
+  std::string_view text;
+  int token;
+};
+
+// The last three are spellings that count as the first word of a definition too.
+constexpr std::array<Keyword, 28> kKeywords = {{
+    {"objectclasses", KEY_OBJECTCLASSES},
+    {"NAME", KEY_NAME},
+    {"DESC", KEY_DESC},
+    {"SUP", KEY_SUP},
+    {"AUXILIARY", KEY_AUXILIARY},
+    {"MUST", KEY_MUST},
+    {"MAY", KEY_MAY},
+    {"STRUCTURAL", KEY_STRUCTURAL},
+    {"attributetypes", KEY_ATTRIBUTETYPES},
+    {"EQUALITY", KEY_EQUALITY},
+    {"SYNTAX", KEY_SYNTAX},
+    {"SINGLE-VALUE", KEY_SINGLE_VALUE},
+    {"USAGE", KEY_USAGE},
+    {"NO-USER-MODIFICATION", KEY_NO_USER_MODIFICATION},
+    {"ORVAttributetypes", KEY_ORVATTRIBUTETYPES},
+    {"ACCESS-CLASS", KEY_ACCESS_CLASS},
+    {"DBNAME", KEY_DBNAME},
+    {"SUBSTR", KEY_SUBSTR},
+    {"REVERSE", KEY_REVERSE},
+    {"ORDERING", KEY_ORDERING},
+    {"COLLECTIVE", KEY_COLLECTIVE},
+    {"OBSOLETE", KEY_OBSOLETE},
+    {"ABSTRACT", KEY_ABSTRACT},
+    {"LENGTH", KEY_LENGTH},
+    {"APPROX", KEY_APPROX},
+    {"objectClasses", KEY_OBJECTCLASSES},
+    {"attributeTypes", KEY_ATTRIBUTETYPES},
+    {"ORVattributeTypes", KEY_ORVATTRIBUTETYPES},
+}};
+constexpr std::size_t kLongestKeyword = 20;
+
+// The character classes of the "C" locale.
+constexpr bool isDigit(char c) { return c >= '0' && c <= '9'; }
+constexpr bool isLetter(char c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); }
+constexpr bool isPrinting(char c) { return c >= ' ' && c <= '~'; }
+
+constexpr bool belongsToWord(char c) {
+  return isLetter(c) || isDigit(c) || c == '_' || c == '-' || c == '\t';
+}
+
+constexpr bool belongsToQuoted(char c) { return (isPrinting(c) && c != '\'') || c == '\t'; }
+
+}  // namespace
+
+TokenReader::TokenReader(InputFile* file) : m_file(file), m_buffer(kBufferSize) {}
+
+TokenReader::TokenReader(std::string_view text)
+    : m_next(text.data()), m_limit(text.data() + text.size()) {}
+
+bool TokenReader::refill() {
+  if (m_file == nullptr) {
+    return false;
+  }
+  // The last character read stays in front, so that it can be put back.
+  m_buffer[0] = m_next == nullptr ? '\0' : *(m_next - 1);
+  m_next = m_buffer.data() + 1;
+  m_limit = m_next;
+  const std::size_t count = m_file->read(m_buffer.data() + 1, kBufferSize - 1);
+  if (count == 0) {
+    return false;
+  }
+  m_limit = m_next + count;
+  return true;
+}
+
+bool TokenReader::read(char* c) {
+  if (m_next == m_limit && !refill()) {
+    m_isAtEnd = true;
+    return false;
+  }
+  *c = *m_next++;
+  ++m_offset;
+  if (*c == '\n') {
+    m_previousLineStart = m_lineStart;
+    m_lineStart = m_offset;
+    ++m_line;
+  }
+  return true;
+}
+
+void TokenReader::putBack() {
+  --m_next;
+  --m_offset;
+  if (*m_next == '\n') {
+    m_lineStart = m_previousLineStart;
+    --m_line;
+  }
+}
+
+// Reads the first character of the next token.
+bool TokenReader::skipToToken(char* c) {
+  while (read(c)) {
+    if (*c == '\n') {
+      ++m_countedLine;
+    } else if (*c == '#') {
+      while (read(c) && *c != '\n') {
+      }
+      ++m_countedLine;
+    } else if (*c != ' ' && *c != '\t') {
+      return true;
+    }
+  }
+  return false;
+}
+
+int TokenReader::lexan() {
+  char c = '\0';
+  if (m_isAtEnd || !skipToToken(&c)) {
+    m_position = {m_line, m_offset - m_lineStart + 1};
+    return TOKEN_END;
+  }
+  m_position = {m_line, m_offset - m_lineStart};
+  int token = static_cast<signed char>(c);
+  if (isDigit(c)) {
+    token = readNumber(c);
+  } else if (isLetter(c) || c == '\'' || c == '-') {
+    token = readWord(c);
+  }
+  if (token != TOKEN_END) {
+    m_current = token;
+  }
+  return token;
+}
+
+void TokenReader::match(int expected) {
+  if (m_current == expected) {
+    m_current = lexan();
+  }
+}
+
+int TokenReader::readNumber(char c) {
+  m_text.clear();
+  do {
+    m_text += c;
+    if (!read(&c)) {
+      return TOKEN_END;
+    }
+  } while (isDigit(c) || c == '.');
+  while (c == ' ') {
+    if (!read(&c)) {
+      return TOKEN_END;
+    }
+  }
+  if (c != '{') {
+    putBack();
+    return lookUp(TOKEN_NUMBER);
+  }
+  int token = TOKEN_NUMBER_BAD_LENGTH;
+  do {
+    m_text += c;
+    if (!read(&c)) {
+      return TOKEN_END;
+    }
+  } while (isDigit(c));
+  if (c == '}' && m_text.back() != '{') {
+    token = TOKEN_NUMBER_LENGTH;
+    m_text += c;
+    if (!read(&c)) {
+      return TOKEN_END;
+    }
+  }
+  putBack();
+  return lookUp(token);
+}
+
+int TokenReader::readWord(char c) {
+  const bool isQuoted = c == '\'';
+  m_text.clear();
+  if (isQuoted && !read(&c)) {
+    return TOKEN_END;
+  }
+  while (isQuoted ? belongsToQuoted(c) : belongsToWord(c)) {
+    m_text += c;
+    if (!read(&c)) {
+      return TOKEN_END;
+    }
+  }
+  // What ended a quoted string is dropped, whatever it was.
+  if (isQuoted && !read(&c)) {
+    return TOKEN_END;
+  }
+  putBack();
+  return lookUp(TOKEN_NAME);
+}
+
+// Quotes make no difference: a keyword in quotes is that keyword. A text that was stored last is the
+// token that it was then, so that 1.2 behind '1.2' is a name.
+int TokenReader::lookUp(int token) {
+  m_textIsStored = false;
+  if (m_hasStored && m_text == m_stored) {
+    return m_storedToken;
+  }
+  if (m_text.size() <= kLongestKeyword) {
+    for (const Keyword& keyword : kKeywords) {
+      if (m_text == keyword.text) {
+        return keyword.token;
+      }
+    }
+  }
+  m_text.swap(m_stored);
+  m_storedToken = token;
+  m_hasStored = true;
+  m_textIsStored = true;
+  return token;
+}
