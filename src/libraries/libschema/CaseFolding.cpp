@@ -7,7 +7,13 @@ namespace libschema {
 
 namespace {
 
-char lower(char c) { return static_cast<char>(std::tolower(static_cast<unsigned char>(c))); }
+// tolower itself is asked only about what some locale may change: never a digit or one of a to z.
+char lower(char c) {
+  if ((c >= 'a' && c <= 'z') || (c >= '0' && c <= '9')) {
+    return c;
+  }
+  return static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+}
 
 bool equalLowered(const std::string& left, const std::string& right) {
   return left.size() == right.size() &&

@@ -3,6 +3,7 @@
 #include <array>
 #include <fstream>
 #include <iostream>
+#include <optional>
 #include <utility>
 
 #include "AscendingLookup.h"
@@ -20,8 +21,8 @@ namespace {
 constexpr char kTableDump[] = "/tmp/table.txt";
 constexpr int kDiagnosticIndent = 5;
 
-template <typename Definition>
-void deleteAll(std::map<std::string, Definition*>* table) {
+template <typename Table>
+void deleteAll(Table* table) {
   for (const auto& entry : *table) {
     const ORVSchema* const definition = entry.second;
     delete definition;
@@ -29,8 +30,8 @@ void deleteAll(std::map<std::string, Definition*>* table) {
   table->clear();
 }
 
-template <typename Definition>
-Definition* findIn(const std::map<std::string, Definition*>& table, const std::string& key) {
+template <typename Table>
+typename Table::mapped_type findIn(const Table& table, const std::string& key) {
   const auto entry = table.find(key);
   return entry == table.end() ? nullptr : entry->second;
 }
@@ -47,8 +48,8 @@ const ORVAttribute* answerOfGetORVAttr(const ORVAttribute* extension) {
   return extension;
 }
 
-template <typename Definition>
-void printTable(const char* heading, const std::map<std::string, Definition*>& table) {
+template <typename Table>
+void printTable(const char* heading, const Table& table) {
   std::cout << heading;
   for (const auto& entry : table) {
     std::cout << std::endl << entry.first << '\t';
@@ -95,7 +96,13 @@ const SchemaManager::SchemaFile* SchemaManager::findFile(const std::string& file
   return nullptr;
 }
 
-SchemaManager::SchemaManager(std::string schemaDirectory) : directory(std::move(schemaDirectory)) {}
+SchemaManager::SchemaManager(std::string schemaDirectory)
+    : attrTable(&tableNodes),
+      ocTable(&tableNodes),
+      orvAttrTable(&tableNodes),
+      attrOidTable(&tableNodes),
+      ocOidTable(&tableNodes),
+      directory(std::move(schemaDirectory)) {}
 
 // The OID indexes only refer: an object that none but they hold is not deleted.
 SchemaManager::~SchemaManager() {
@@ -246,44 +253,58 @@ class SchemaManager::FileReader {
   }
 
   // Every table keeps the definition that it has under a key. One that no table takes is deleted.
+  // Neighbours in a file often have neighbouring OIDs, so each insertion by OID starts at the last
+  // one.
   void insert(std::unique_ptr<Attribute> definition) {
     noteOid(*definition);
-    insertByNameAndOid(std::move(definition), &m_manager.attrTable, &m_manager.attrOidTable);
+    insertByNameAndOid(std::move(definition), &m_manager.attrTable, &m_attributes);
   }
 
   void insert(std::unique_ptr<ObjectClass> definition) {
     noteOid(*definition);
-    insertByNameAndOid(std::move(definition), &m_manager.ocTable, &m_manager.ocOidTable);
+    insertByNameAndOid(std::move(definition), &m_manager.ocTable, &m_objectClasses);
   }
 
   void insert(std::unique_ptr<ORVAttribute> definition) {
     noteOid(*definition);
-    insertUnder(definition->oidInPlace(), &definition, &m_manager.orvAttrTable);
+    if (m_extensions.insert(definition->oidInPlace(), definition.get())) {
+      static_cast<void>(definition.release());
+    }
   }
 
   void noteOid(const ORVSchema& definition) {
     if (m_file.oids != nullptr) {
       OidSet& oids = m_manager.*m_file.oids;
-      oids.insert(oids.end(), definition.oidInPlace());
+      m_lastOid = oids.insert(m_lastOid.value_or(oids.end()), definition.oidInPlace());
     }
   }
 
   template <typename Definition>
-  void insertByNameAndOid(std::unique_ptr<Definition> definition, Table<Definition>* byName,
-                          Table<Definition>* byOid) {
+  class ByOid {
+   public:
+    explicit ByOid(OidTable<Definition>* table) : m_table(*table), m_last(table->end()) {}
+
+    // True when the table holds the definition afterwards.
+    bool insert(const std::string& oid, Definition* definition) {
+      m_last = m_table.try_emplace(m_last, oid, definition);
+      return m_last->second == definition;
+    }
+
+   private:
+    OidTable<Definition>& m_table;
+    typename OidTable<Definition>::iterator m_last;
+  };
+
+  template <typename Definition>
+  static void insertByNameAndOid(std::unique_ptr<Definition> definition,
+                                 NameTable<Definition>* byName, ByOid<Definition>* byOid) {
     Definition* const inserted = definition.get();
-    insertUnder(inserted->getFirstNameLower(), &definition, byName);
-    // The index takes the object whether the name table did or not.
-    if (byOid->try_emplace(byOid->end(), inserted->oidInPlace(), inserted)->second == inserted) {
+    if (byName->try_emplace(inserted->getFirstNameLower(), inserted).second) {
       static_cast<void>(definition.release());
     }
-  }
-
-  template <typename Definition>
-  void insertUnder(const std::string& key, std::unique_ptr<Definition>* definition,
-                   Table<Definition>* table) {
-    if (table->try_emplace(table->end(), key, definition->get())->second == definition->get()) {
-      static_cast<void>(definition->release());
+    // The index takes the object whether the name table did or not.
+    if (byOid->insert(inserted->oidInPlace(), inserted)) {
+      static_cast<void>(definition.release());
     }
   }
 
@@ -291,6 +312,10 @@ class SchemaManager::FileReader {
   SchemaLexan& m_lexer;
   const SchemaFile& m_file;
   tracepoint::ReadFile& m_trace;
+  ByOid<Attribute> m_attributes{&m_manager.attrOidTable};
+  ByOid<ObjectClass> m_objectClasses{&m_manager.ocOidTable};
+  ByOid<ORVAttribute> m_extensions{&m_manager.orvAttrTable};
+  std::optional<OidSet::iterator> m_lastOid;
   std::array<std::ofstream, 4> m_diagnostics;  // by kind of definition, and the analyser's last
 };
 
@@ -454,9 +479,9 @@ int SchemaManager::writeOids(const OidSet& oids, const std::string& path) {
     out.flush();
     text.clear();
   };
-  AscendingLookup<Table<ObjectClass>> objectClasses(ocOidTable);
-  AscendingLookup<Table<Attribute>> attributes(attrOidTable);
-  AscendingLookup<Table<ORVAttribute>> extensions(orvAttrTable);
+  AscendingLookup<OidTable<ObjectClass>> objectClasses(ocOidTable);
+  AscendingLookup<OidTable<Attribute>> attributes(attrOidTable);
+  AscendingLookup<OidTable<ORVAttribute>> extensions(orvAttrTable);
   for (const std::string& oid : oids) {
     const auto objectClass = objectClasses.find(oid);
     if (objectClass != ocOidTable.end()) {

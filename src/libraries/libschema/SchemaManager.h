@@ -17,8 +17,10 @@
 
 #include <map>
 #include <memory>
+#include <memory_resource>
 #include <set>
 #include <string>
+#include <string_view>
 
 #include "Attribute.h"
 #include "ORVAttribute.h"
@@ -144,8 +146,13 @@ class SchemaManager {
 
  private:
   using OidSet = std::set<std::string>;
+
+  // The key of a table by OID lies in the definition that the entry holds: a definition stays,
+  // owned or not, as long as a table refers to it.
   template <typename Definition>
-  using Table = std::map<std::string, Definition*>;
+  using NameTable = std::pmr::map<std::string, Definition*>;
+  template <typename Definition>
+  using OidTable = std::pmr::map<std::string_view, Definition*>;
 
   // A schema file that can be read; `oids` is null for the two that have no set.
   struct SchemaFile {
@@ -173,11 +180,12 @@ class SchemaManager {
   int writeOids(const OidSet& oids, const std::string& path);
 
   std::unique_ptr<SchemaLexan> lexan;  // null but while a file is read
-  Table<Attribute> attrTable;          // by lower-cased first name; owner
-  Table<ObjectClass> ocTable;          // by lower-cased first name; owner
-  Table<ORVAttribute> orvAttrTable;    // by OID; owner
-  Table<Attribute> attrOidTable;       // by OID; the objects of attrTable
-  Table<ObjectClass> ocOidTable;       // by OID; the objects of ocTable
+  std::pmr::monotonic_buffer_resource tableNodes;
+  NameTable<Attribute> attrTable;       // by lower-cased first name; owner
+  NameTable<ObjectClass> ocTable;       // by lower-cased first name; owner
+  OidTable<ORVAttribute> orvAttrTable;  // by OID; owner
+  OidTable<Attribute> attrOidTable;     // by OID; the objects of attrTable
+  OidTable<ObjectClass> ocOidTable;     // by OID; the objects of ocTable
   std::string directory;
   OidSet userAtOids;
   OidSet userOcOids;

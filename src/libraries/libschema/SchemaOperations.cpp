@@ -1,7 +1,9 @@
 // The operations between two managers: comparison, merge, collision check, and the reports of the
 // last.
 
+#include <iterator>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -19,23 +21,19 @@ struct SchemaManager::Operations {
   struct Kind;
 
   template <typename Definition>
-  using Iterator = typename Table<Definition>::iterator;
-
+  using Table = typename Kind<Definition>::Table;
   template <typename Definition>
-  static bool sameEntry(const Iterator<Definition>& entry, const Iterator<Definition>& end,
-                        const std::string& key) {
-    return entry != end && entry->first == key;
-  }
+  using Iterator = typename Table<Definition>::iterator;
 
   // The answer of the kind's look-up to the key of `entry`, asked of the manager that holds it.
   template <typename Definition>
   static const Definition& definitionAt(const SchemaManager& manager,
                                         const typename Table<Definition>::value_type& entry) {
-    if (!Kind<Definition>::kFoldsKeys || libschema::isLowered(entry.first)) {
-      typename Kind<Definition>::LookUp trace;
-      return *entry.second;
+    if (!Kind<Definition>::takesAsItIs(entry.first)) {
+      return orNew(Kind<Definition>::lookUp(manager, std::string(entry.first)));
     }
-    return orNew(Kind<Definition>::lookUp(manager, entry.first));
+    typename Kind<Definition>::LookUp trace;
+    return *entry.second;
   }
 
   // An absent definition reads as a newly constructed one.
@@ -72,6 +70,18 @@ struct SchemaManager::Operations {
     std::vector<std::string> m_keys;
   };
 
+  // Puts `moved`, whose OID is the key of the entry, in the place of the entry's definition. The
+  // key lies in the definition, so it changes with it.
+  template <typename Definition>
+  static void rebind(OidTable<Definition>* table, typename OidTable<Definition>::iterator place,
+                     Definition* moved) {
+    const auto next = std::next(place);
+    auto node = table->extract(place);
+    node.key() = moved->oidInPlace();
+    node.mapped() = moved;
+    table->insert(next, std::move(node));
+  }
+
   template <typename Definition>
   static void compare(SchemaManager* self, SchemaManager* reference);
   template <typename Definition>
@@ -84,20 +94,21 @@ struct SchemaManager::Operations {
   template <typename Definition>
   static void check(SchemaManager* self, SchemaManager* reference);
   static bool isKey(const SchemaManager& reference, const std::string& oid);
-  template <typename Definition>
-  static std::string report(const char* noneText, const char* heading,
-                            const Table<Definition>& table);
+  template <typename Definitions>
+  static std::string report(const char* noneText, const char* heading, const Definitions& table);
   static OidSet* findFileSet(SchemaManager* self, SchemaManager* source, const std::string& oid);
 };
 
 template <>
 struct SchemaManager::Operations::Kind<Attribute> {
+  using Table = NameTable<Attribute>;
   using LookUp = tracepoint::GetAttr;
-  static constexpr bool kFoldsKeys = true;
   static constexpr bool kHasFileSet = true;
   static constexpr bool kPrunesOidTable = true;
-  static constexpr Table<Attribute> SchemaManager::*kTable = &SchemaManager::attrTable;
-  static constexpr Table<Attribute> SchemaManager::*kOidTable = &SchemaManager::attrOidTable;
+  static constexpr Table SchemaManager::*kTable = &SchemaManager::attrTable;
+  static constexpr OidTable<Attribute> SchemaManager::*kOidTable = &SchemaManager::attrOidTable;
+  // False for a key whose letter case the look-up changes.
+  static bool takesAsItIs(const std::string& key) { return libschema::isLowered(key); }
   static const Attribute* lookUp(const SchemaManager& manager, const std::string& key) {
     return manager.lookUpAttr(key);
   }
@@ -109,12 +120,13 @@ struct SchemaManager::Operations::Kind<Attribute> {
 
 template <>
 struct SchemaManager::Operations::Kind<ObjectClass> {
+  using Table = NameTable<ObjectClass>;
   using LookUp = tracepoint::GetObjClass;
-  static constexpr bool kFoldsKeys = false;
   static constexpr bool kHasFileSet = true;
   static constexpr bool kPrunesOidTable = false;
-  static constexpr Table<ObjectClass> SchemaManager::*kTable = &SchemaManager::ocTable;
-  static constexpr Table<ObjectClass> SchemaManager::*kOidTable = &SchemaManager::ocOidTable;
+  static constexpr Table SchemaManager::*kTable = &SchemaManager::ocTable;
+  static constexpr OidTable<ObjectClass> SchemaManager::*kOidTable = &SchemaManager::ocOidTable;
+  static bool takesAsItIs(const std::string& /*key*/) { return true; }
   static const ObjectClass* lookUp(const SchemaManager& manager, const std::string& key) {
     return manager.lookUpObjClass(key);
   }
@@ -127,11 +139,12 @@ struct SchemaManager::Operations::Kind<ObjectClass> {
 // Vendor extensions are keyed by OID. Dropping one in a comparison leaves every file set as it is.
 template <>
 struct SchemaManager::Operations::Kind<ORVAttribute> {
+  using Table = OidTable<ORVAttribute>;
   using LookUp = tracepoint::GetORVAttr;
-  static constexpr bool kFoldsKeys = false;
   static constexpr bool kHasFileSet = false;
   static constexpr bool kPrunesOidTable = false;
-  static constexpr Table<ORVAttribute> SchemaManager::*kTable = &SchemaManager::orvAttrTable;
+  static constexpr Table SchemaManager::*kTable = &SchemaManager::orvAttrTable;
+  static bool takesAsItIs(std::string_view /*key*/) { return true; }
   static const ORVAttribute* lookUp(const SchemaManager& manager, const std::string& key) {
     return manager.lookUpORVAttr(key);
   }
@@ -161,7 +174,7 @@ void SchemaManager::Operations::compare(SchemaManager* self, SchemaManager* refe
     const Definition* theirs = nullptr;
     if (found != references.end()) {
       theirs = entry->first == key ? &definitionAt<Definition>(*reference, *found)
-                                   : &orNew(Rules::lookUp(*reference, entry->first));
+                                   : &orNew(Rules::lookUp(*reference, std::string(entry->first)));
     }
     const std::string& oid = mine.oidInPlace();
     if (!self->excludes(oid) && (theirs == nullptr || !Rules::areEqual(mine, *theirs))) {
@@ -226,7 +239,7 @@ void SchemaManager::Operations::replace(SchemaManager* self, const std::string& 
                                         Iterator<Definition> place, Definition* moved) {
   using Rules = Kind<Definition>;
   Table<Definition>& byName = self->*Rules::kTable;
-  Table<Definition>& byOid = self->*Rules::kOidTable;
+  OidTable<Definition>& byOid = self->*Rules::kOidTable;
   const std::string& oid = moved->oidInPlace();
   const Definition* const replaced = Rules::lookUp(*self, oid);
   if (replaced != nullptr) {
@@ -237,11 +250,14 @@ void SchemaManager::Operations::replace(SchemaManager* self, const std::string& 
     } else {
       byName.erase(replacedName);
     }
-    if (replacedOid == oid) {
-      byOid[oid] = moved;
+    const auto indexed = byOid.find(replacedOid);
+    if (indexed != byOid.end() && replacedOid == oid) {
+      rebind(&byOid, indexed, moved);
       return;
     }
-    byOid.erase(replacedOid);
+    if (indexed != byOid.end()) {
+      byOid.erase(indexed);
+    }
   }
   byOid.try_emplace(oid, moved);
 }
@@ -272,11 +288,11 @@ bool SchemaManager::Operations::merge(SchemaManager* self, SchemaManager* source
     Definition* const moved = entry.second;
     const auto& key = Rules::keyOf(*moved);
     const auto place = table.lower_bound(key);
-    if (sameEntry<Definition>(place, table.end(), key)) {
+    if (place != table.end() && place->first == key) {
       if constexpr (Rules::kHasFileSet) {
         replace(self, key, place, moved);
       } else {
-        place->second = moved;
+        rebind(&table, place, moved);
       }
       continue;
     }
@@ -392,9 +408,9 @@ bool SchemaManager::checkORVAttrs(SchemaManager* reference) {
 
 // ---- Reports ----
 
-template <typename Definition>
+template <typename Definitions>
 std::string SchemaManager::Operations::report(const char* noneText, const char* heading,
-                                              const Table<Definition>& table) {
+                                              const Definitions& table) {
   if (table.empty()) {
     return noneText;
   }

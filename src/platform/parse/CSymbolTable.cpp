@@ -37,7 +37,9 @@ CSymbolTable::Entry* CSymbolTable::appendEntry(Kind kind, int token, bool isKeyw
 
 // Puts the entry last in its bucket, so that a look-up meets the lowest index first.
 void CSymbolTable::link(int index) {
-  int* place = &m_buckets[bucketOf(m_entries[static_cast<std::size_t>(index)].text)];
+  Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  entry.bucket = bucketOf(entry.text);
+  int* place = &m_buckets[entry.bucket];
   while (*place >= 0) {
     place = &m_entries[static_cast<std::size_t>(*place)].next;
   }
@@ -46,7 +48,7 @@ void CSymbolTable::link(int index) {
 
 void CSymbolTable::unlink(int index) {
   const Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  int* place = &m_buckets[bucketOf(entry.text)];
+  int* place = &m_buckets[entry.bucket];
   while (*place != index) {
     place = &m_entries[static_cast<std::size_t>(*place)].next;
   }

@@ -68,6 +68,7 @@ class CSymbolTable {
     bool isKeyword = false;
     char character = '\0';
     int token = -1;
+    std::size_t bucket = 0;
     int next = -1;  // the next string entry in the same bucket
     std::string text;
   };

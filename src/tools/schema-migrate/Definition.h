@@ -32,8 +32,8 @@ struct Definition {
 // Appends the line that the library writes for `object`, with its line end.
 void appendLine(DefinitionKind kind, ORVSchema* object, std::string* text);
 
-// True when the library takes both for the same definition. Both have their objects and one kind; it
-// is `definition` that is compared with `other`.
+// True when the library takes both for the same definition. Both have their objects and one kind;
+// it is `definition` that is compared with `other`.
 bool isEqual(const Definition& definition, const Definition& other);
 
 // "attribute type cn (2.5.4.3)".

@@ -1,5 +1,5 @@
-// Reads the definitions of one schema file the way the library's manager does, and hands over each one
-// with the block form it stood in, which the manager keeps to itself.
+// Reads the definitions of one schema file the way the library's manager does, and hands over each
+// one with the block form it stood in, which the manager keeps to itself.
 
 #ifndef SCHEMA_MIGRATE_DEFINITION_READER_H
 #define SCHEMA_MIGRATE_DEFINITION_READER_H

@@ -1,5 +1,5 @@
-// A digest of 128 bits (FNV-1a) and the length of the bytes that it was made of. Two equal ones stand
-// for equal bytes: it guards against damage, not against a forger.
+// A digest of 128 bits (FNV-1a) and the length of the bytes that it was made of. Two equal ones
+// stand for equal bytes: it guards against damage, not against a forger.
 
 #ifndef SCHEMA_MIGRATE_DIGEST_H
 #define SCHEMA_MIGRATE_DIGEST_H
@@ -31,8 +31,7 @@ class Digest {
   __extension__ using State = unsigned __int128;
 
   static constexpr State kPrime = (State{1} << 88) + 0x13b;
-  static constexpr State kStart =
-      (State{0x6c62272e07bb0142} << 64) + State{0x62b821756295c58d};
+  static constexpr State kStart = (State{0x6c62272e07bb0142} << 64) + State{0x62b821756295c58d};
 
   State m_state = kStart;
   std::uint64_t m_length = 0;

@@ -107,7 +107,11 @@ Outcome Forecaster::readAfterKeyword(int keyword, int* token) {
   const int opening = m_tokens.lexan();
   if (opening != '=' && opening != '{') {
     m_kind = kind;
-    return failed(m_tokens.position(), std::string("neither \"=\" nor \"{\" stands behind the word that begins ") + (kind == DefinitionKind::kVendorExtension ? "a " : "an ") + nameOf(kind) + "; write \"=\" before a single definition, \"{\" before a block of them, or take the word away");
+    return failed(
+        m_tokens.position(),
+        std::string("neither \"=\" nor \"{\" stands behind the word that begins ") +
+            (kind == DefinitionKind::kVendorExtension ? "a " : "an ") + nameOf(kind) +
+            "; write \"=\" before a single definition, \"{\" before a block of them, or take the word away");
   }
   Outcome outcome = readDefinition(kind, opening == '=' ? &begin : nullptr, true);
   while (opening == '{' && outcome == Outcome::kRead && m_tokens.currentToken() != '}') {
@@ -117,8 +121,8 @@ Outcome Forecaster::readAfterKeyword(int keyword, int* token) {
   return outcome;
 }
 
-// What every definition begins with: the token on which the reader stands is passed over, and "(" if
-// it comes next.
+// What every definition begins with: the token on which the reader stands is passed over, and "("
+// if it comes next.
 Outcome Forecaster::readDefinition(DefinitionKind kind, const Position* keyword, bool isFirst) {
   const Position before = m_tokens.position();
   m_tokens.match(m_tokens.currentToken());
@@ -161,7 +165,10 @@ Outcome Forecaster::attributeType() {
 Outcome Forecaster::attributeClause(int* token) {
   switch (*token) {
     case KEY_COLLECTIVE:
-      return neverEnds(m_tokens.position(), "COLLECTIVE stands in " + definition() + "; the reader does not get past this word, so reading would never end; remove the word");
+      return neverEnds(
+          m_tokens.position(),
+          "COLLECTIVE stands in " + definition() +
+              "; the reader does not get past this word, so reading would never end; remove the word");
     case KEY_NAME:
       return attributeNames(token);
     case TOKEN_NUMBER:
@@ -191,7 +198,10 @@ Outcome Forecaster::attributeNames(int* token) {
   do {
     *token = next();
     if (*token == TOKEN_END) {
-      return neverEnds(clause, "nothing ends the NAME clause of " + definition() + ": only another clause does, \")\" does not, and none follows to the end of the file, so reading would never end; put a clause behind the names, as in NAME 'a' USAGE userApplications )");
+      return neverEnds(
+          clause,
+          "nothing ends the NAME clause of " + definition() +
+              ": only another clause does, \")\" does not, and none follows to the end of the file, so reading would never end; put a clause behind the names, as in NAME 'a' USAGE userApplications )");
     }
   } while (!endsAttributeNames(*token));
   return Outcome::kRead;
@@ -222,7 +232,10 @@ Outcome Forecaster::objectClass() {
 Outcome Forecaster::objectClassClause(int* token) {
   switch (*token) {
     case TOKEN_NUMBER_BAD_LENGTH:
-      return failed(m_tokens.position(), "the length of the number \"" + printable(m_tokens.text()) + "\" in " + definition() + " is not complete; write digits and \"}\" behind the \"{\", or take the \"{\" away");
+      return failed(
+          m_tokens.position(),
+          "the length of the number \"" + printable(m_tokens.text()) + "\" in " + definition() +
+              " is not complete; write digits and \"}\" behind the \"{\", or take the \"{\" away");
     case KEY_NAME:
       return classNames(token);
     case TOKEN_NUMBER:
@@ -261,7 +274,10 @@ Outcome Forecaster::classNames(int* token) {
   m_previous = *token;
   while (!endsClassNames(*token)) {
     if (*token == TOKEN_END) {
-      return neverEnds(clause, "nothing ends the NAME clause of " + definition() + ": only DESC, OBSOLETE, SUP, the kind of the class, MUST or MAY does, \")\" does not, and none follows to the end of the file, so reading would never end; put the kind behind the names, as in NAME 'a' STRUCTURAL )");
+      return neverEnds(
+          clause,
+          "nothing ends the NAME clause of " + definition() +
+              ": only DESC, OBSOLETE, SUP, the kind of the class, MUST or MAY does, \")\" does not, and none follows to the end of the file, so reading would never end; put the kind behind the names, as in NAME 'a' STRUCTURAL )");
     }
     *token = next();
   }
@@ -337,7 +353,10 @@ Outcome Forecaster::databaseNames(int* token, bool* isComplete) {
   m_previous = *token;
   while (!endsDatabaseNames(*token)) {
     if (*token == TOKEN_END) {
-      return neverEnds(clause, "nothing ends the DBNAME list of " + definition() + ": neither \")\" nor another clause follows to the end of the file, so reading would never end; put \")\" behind the names");
+      return neverEnds(
+          clause,
+          "nothing ends the DBNAME list of " + definition() +
+              ": neither \")\" nor another clause follows to the end of the file, so reading would never end; put \")\" behind the names");
     }
     *token = next();
   }
@@ -356,7 +375,11 @@ int Forecaster::next() {
   const Position previous = m_tokens.position();
   const int token = m_tokens.lexan();
   if (startsDefinition(m_previous) && (token == '=' || token == '{')) {
-    report(previous, "the " + std::string(nameOf(kindOf(m_previous))) + " that begins here is taken for a part of " + definition() + ", which nothing ends before, and is lost; close that one, and see that another clause follows its NAME clause");
+    report(
+        previous,
+        "the " + std::string(nameOf(kindOf(m_previous))) +
+            " that begins here is taken for a part of " + definition() +
+            ", which nothing ends before, and is lost; close that one, and see that another clause follows its NAME clause");
   }
   m_previous = token;
   return token;
@@ -371,7 +394,10 @@ int Forecaster::afterValue() {
 // A bare word or number: the last one becomes the OID.
 int Forecaster::oid() {
   if (m_hasOid) {
-    report(m_tokens.position(), "\"" + printable(m_tokens.text()) + "\" takes the place of the OID of " + definition() + ": it stands where a clause begins and is no keyword that is known there; remove it");
+    report(
+        m_tokens.position(),
+        "\"" + printable(m_tokens.text()) + "\" takes the place of the OID of " + definition() +
+            ": it stands where a clause begins and is no keyword that is known there; remove it");
   }
   m_hasOid = true;
   return next();
@@ -383,7 +409,8 @@ Outcome Forecaster::failed(const Position& position, const std::string& problem)
 }
 
 Outcome Forecaster::notClosed(const std::string& what) {
-  return failed(m_tokens.position(), definition() + " is not closed: " + what + " comes before its \")\"; write \")\" at its end");
+  return failed(m_tokens.position(), definition() + " is not closed: " + what +
+                                         " comes before its \")\"; write \")\" at its end");
 }
 
 Outcome Forecaster::neverEnds(const Position& position, const std::string& problem) {
@@ -400,7 +427,8 @@ void Forecaster::report(const Position& position, const std::string& problem) {
 }
 
 std::string Forecaster::definition() const {
-  return "the " + std::string(nameOf(m_kind)) + " that begins in line " + std::to_string(m_begin.line);
+  return "the " + std::string(nameOf(m_kind)) + " that begins in line " +
+         std::to_string(m_begin.line);
 }
 
 }  // namespace

@@ -1,10 +1,11 @@
-// Foresees what the library's reading of a schema file comes to, without reading it with the library,
-// since on some inputs that never ends:
+// Foresees what the library's reading of a schema file comes to, without reading it with the
+// library, since on some inputs that never ends:
 //   - COLLECTIVE where a clause of an attribute type begins;
 //   - a NAME clause that the end of the file is met in;
 //   - a DBNAME list that the end of the file is met in.
 // Everything else ends. The forecast goes token by token through what the reader and the three
-// definitions do, once over the input, and stops where they stop; it holds one buffer and two words.
+// definitions do, once over the input, and stops where they stop; it holds one buffer and two
+// words.
 
 #ifndef SCHEMA_MIGRATE_ENDLESS_INPUT_H
 #define SCHEMA_MIGRATE_ENDLESS_INPUT_H
@@ -44,8 +45,8 @@ class ForecastObserver {
   virtual void oddity(const Position& position, const std::string& problem) = 0;
 };
 
-// An error while reading shows in file->problem(); the forecast means nothing then. `observer` may be
-// null.
+// An error while reading shows in file->problem(); the forecast means nothing then. `observer` may
+// be null.
 Forecast foreseeReading(InputFile* file, ForecastObserver* observer);
 Forecast foreseeReading(std::string_view text, ForecastObserver* observer);
 

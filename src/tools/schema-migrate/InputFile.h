@@ -1,5 +1,5 @@
-// A file that is only read. Nothing but a regular file is ever opened for reading, so that neither a
-// FIFO nor a device can block the program.
+// A file that is only read. Nothing but a regular file is ever opened for reading, so that neither
+// a FIFO nor a device can block the program.
 
 #ifndef SCHEMA_MIGRATE_INPUT_FILE_H
 #define SCHEMA_MIGRATE_INPUT_FILE_H

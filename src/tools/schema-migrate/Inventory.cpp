@@ -40,7 +40,8 @@ struct CloseDirectory {
 std::vector<std::string> namesIn(const std::string& role, const std::string& directory) {
   const std::unique_ptr<DIR, CloseDirectory> open(::opendir(directory.c_str()));
   if (open == nullptr) {
-    throw Failure(kBadInput, errorLine(directory, "the directory of " + role + " cannot be read: " + systemError(errno)));
+    throw Failure(kBadInput, errorLine(directory, "the directory of " + role +
+                                                      " cannot be read: " + systemError(errno)));
   }
   std::vector<std::string> names;
   while (const dirent* entry = ::readdir(open.get())) {
@@ -79,11 +80,16 @@ void Inventory::findFiles(std::string* warnings) {
       m_hasFile[file] = true;
       isAny = true;
     } else if (name.compare(0, 3, "V3.") == 0) {
-      *warnings += warningLine(m_directory + "/" + printable(name), "not read, since no schema file has this name; rename it if it belongs to the schema");
+      *warnings += warningLine(
+          m_directory + "/" + printable(name),
+          "not read, since no schema file has this name; rename it if it belongs to the schema");
     }
   }
   if (!isAny) {
-    throw Failure(kBadInput, errorLine(m_directory, "no V3.* schema file in the directory of " + m_role + "; name the directory that holds V3.system.at and its like"));
+    throw Failure(
+        kBadInput,
+        errorLine(m_directory, "no V3.* schema file in the directory of " + m_role +
+                                   "; name the directory that holds V3.system.at and its like"));
   }
 }
 
@@ -125,7 +131,8 @@ std::string Inventory::takeDefinitions(std::size_t file, const std::vector<std::
   };
   const bool isRead = readDefinitions(m_directory, kSchemaFiles[file], take);
   if (!isRead || m_counts[file] != lines.size()) {
-    return errorLine(pathOf(file), "changed while it was read; try again when nothing writes to it");
+    return errorLine(pathOf(file),
+                     "changed while it was read; try again when nothing writes to it");
   }
   return "";
 }

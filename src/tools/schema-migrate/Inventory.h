@@ -1,5 +1,5 @@
-// Everything that one installation's schema files define, as found in the files: what the library will
-// read, and where it stands.
+// Everything that one installation's schema files define, as found in the files: what the library
+// will read, and where it stands.
 
 #ifndef SCHEMA_MIGRATE_INVENTORY_H
 #define SCHEMA_MIGRATE_INVENTORY_H

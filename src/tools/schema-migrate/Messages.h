@@ -32,8 +32,8 @@ class Failure : public std::runtime_error {
   ExitCode m_exitCode;
 };
 
-// One line each, with its line end: "schema-migrate: error: TEXT", "PLACE: error: TEXT" and the same
-// with "warning". A place is a path, or what placeOf makes of one.
+// One line each, with its line end: "schema-migrate: error: TEXT", "PLACE: error: TEXT" and the
+// same with "warning". A place is a path, or what placeOf makes of one.
 std::string errorLine(const std::string& text);
 std::string errorLine(const std::string& place, const std::string& text);
 std::string warningLine(const std::string& text);
@@ -49,8 +49,8 @@ std::string systemError(int errorNumber);
 // "1 definition", "2 definitions".
 std::string counted(std::uint64_t count, const std::string& noun);
 
-// Bytes that a terminal could take for a command, and those of 128 and more, as \xNN; a long text is
-// cut short.
+// Bytes that a terminal could take for a command, and those of 128 and more, as \xNN; a long text
+// is cut short.
 std::string printable(const std::string& text);
 
 #endif  // SCHEMA_MIGRATE_MESSAGES_H

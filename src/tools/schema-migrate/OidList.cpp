@@ -58,6 +58,11 @@ void readOidList(const std::string& path, std::set<std::string>* oids) {
     throw Failure(kBadInput, errorLine(path, "the list of OIDs cannot be read: " + file.problem()));
   }
   if (!words.lastWord().empty()) {
-    throw Failure(kBadInput, errorLine(placeOf(path, words.line()), "no line break behind the last OID, " + printable(words.lastWord()) + ", which would therefore not count; add a line break at the end of the file"));
+    throw Failure(
+        kBadInput,
+        errorLine(
+            placeOf(path, words.line()),
+            "no line break behind the last OID, " + printable(words.lastWord()) +
+                ", which would therefore not count; add a line break at the end of the file"));
   }
 }

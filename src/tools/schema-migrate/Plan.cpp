@@ -2,7 +2,8 @@
 
 namespace {
 
-constexpr char kNoOid[] = "it has no OID, and in a block such a definition is passed over; give it its OID";
+constexpr char kNoOid[] =
+    "it has no OID, and in a block such a definition is passed over; give it its OID";
 
 // True when losing `repeated` loses nothing: it says what `earlier` says, or what V3.modifiedschema
 // says in its place.
@@ -113,9 +114,13 @@ void Plan::judgeUnread(const Definition& definition) {
   } else if (isOnlyRepeated(definition, *earlier)) {
     ++m_balance.repeated;
   } else if (definition.kind == DefinitionKind::kVendorExtension) {
-    lose(definition, "the one at " + placeOf(*earlier) + " has the same OID and is read first; remove one of the two");
+    lose(definition, "the one at " + placeOf(*earlier) +
+                         " has the same OID and is read first; remove one of the two");
   } else {
-    lose(definition, named(*earlier) + " has the same first name and is read first; remove one of the two, or give it a name of its own");
+    lose(
+        definition,
+        named(*earlier) +
+            " has the same first name and is read first; remove one of the two, or give it a name of its own");
   }
 }
 
@@ -136,7 +141,10 @@ void Plan::judgeNew(const Definition& definition, bool wasWritten) {
   if (earlier == nullptr) {
     warn(definition, reason);
   } else if (!isOnlyRepeated(definition, *earlier)) {
-    warn(definition, named(*earlier) + " has the same OID and is read first; remove one of the two, or give it an OID of its own");
+    warn(
+        definition,
+        named(*earlier) +
+            " has the same OID and is read first; remove one of the two, or give it an OID of its own");
   }
 }
 
@@ -147,15 +155,16 @@ std::string Plan::whyNotWritten(const Definition& definition, const Definition**
   const bool isExtension = definition.kind == DefinitionKind::kVendorExtension;
   const Definition* const holder =
       isExtension ? nullptr : tables.atOid(definition.kind, definition.oid);
-  const Definition* const objectClass =
-      tables.atOid(DefinitionKind::kObjectClass, definition.oid);
+  const Definition* const objectClass = tables.atOid(DefinitionKind::kObjectClass, definition.oid);
   if (definition.kind != DefinitionKind::kObjectClass && objectClass != nullptr) {
     *culprit = objectClass;
-    return named(*objectClass) + " has the same OID, and of the two only the object class is written; give one of them an OID of its own";
+    return named(*objectClass) +
+           " has the same OID, and of the two only the object class is written; give one of them an OID of its own";
   }
   if (holder != nullptr && holder != &definition) {
     *culprit = holder;
-    return named(*holder) + " has the same OID, and only one of the two is written; give one of them an OID of its own";
+    return named(*holder) +
+           " has the same OID, and only one of the two is written; give one of them an OID of its own";
   }
   if (isExtension && tables.atOid(DefinitionKind::kAttributeType, definition.oid) == nullptr) {
     return "no attribute type has its OID, and a vendor extension is written with its attribute type only; define the attribute type, or remove the extension";
@@ -166,7 +175,9 @@ std::string Plan::whyNotWritten(const Definition& definition, const Definition**
 void Plan::fillContents() {
   const Tables& tables = m_rehearsal.newTables();
   for (std::size_t file = 0; file < kWrittenFiles; ++file) {
-    for (const std::string_view oid : tables.oidsOf(file)) {
+    const std::vector<std::string_view> oids = tables.oidsOf(file);
+    m_isWrittenEmpty[file] = oids.empty();
+    for (const std::string_view oid : oids) {
       for (const Definition* const definition : tables.writtenFor(oid)) {
         if (definition != nullptr) {
           m_contents[file].push_back(definition);
@@ -177,7 +188,8 @@ void Plan::fillContents() {
 }
 
 void Plan::refuse(const Definition& definition, const std::string& reason) {
-  m_refusals += errorLine(placeOf(definition), describe(definition) + " cannot be migrated: " + reason);
+  m_refusals +=
+      errorLine(placeOf(definition), describe(definition) + " cannot be migrated: " + reason);
   ++m_refusalCount;
 }
 

@@ -1,5 +1,5 @@
-// What a migration will write and what will get lost in it, worked out before it is made. The library
-// drops some definitions without a word: here each one is named.
+// What a migration will write and what will get lost in it, worked out before it is made. The
+// library drops some definitions without a word: here each one is named.
 
 #ifndef SCHEMA_MIGRATE_PLAN_H
 #define SCHEMA_MIGRATE_PLAN_H
@@ -45,6 +45,9 @@ class Plan {
     return m_contents[file];
   }
 
+  // True when not even an OID belongs to the file, which then is written without its header.
+  bool isWrittenEmpty(std::size_t file) const { return m_isWrittenEmpty[file]; }
+
   Fate fateOf(const Definition& definition) { return m_rehearsal.fateOf(definition); }
   const Balance& balance() const { return m_balance; }
 
@@ -70,6 +73,7 @@ class Plan {
   std::uint64_t m_refusalCount = 0;
   std::string m_warnings;
   std::array<std::vector<const Definition*>, kWrittenFiles> m_contents;
+  std::array<bool, kWrittenFiles> m_isWrittenEmpty{};
 };
 
 #endif  // SCHEMA_MIGRATE_PLAN_H

@@ -8,14 +8,19 @@ std::string shown(const std::string& oid) { return oid.empty() ? "(no OID)" : pr
 
 // Why no file set of OLD holds the OID of `lacking`, which NEW lacks.
 std::string whyInNoFile(const Definition& lacking) {
-  const std::string exclude = "or list " + shown(lacking.oid) + " in a file for --exclude-oids to go without it";
+  const std::string exclude =
+      "or list " + shown(lacking.oid) + " in a file for --exclude-oids to go without it";
   if (lacking.file >= kMergedFiles) {
-    return "NEW lacks it, and OLD knows it only from " + std::string(kSchemaFiles[lacking.file]) + ", so that no file of the output would hold it; put its line into V3.user.at or V3.user.oc of OLD as well, " + exclude;
+    return "NEW lacks it, and OLD knows it only from " + std::string(kSchemaFiles[lacking.file]) +
+           ", so that no file of the output would hold it; put its line into V3.user.at or V3.user.oc of OLD as well, " +
+           exclude;
   }
   if (lacking.kind == DefinitionKind::kVendorExtension) {
-    return "NEW lacks it but defines its attribute type as OLD does, and with that the OID leaves the only file of OLD that holds it; put its line into V3.orv.at of OLD as well, " + exclude;
+    return "NEW lacks it but defines its attribute type as OLD does, and with that the OID leaves the only file of OLD that holds it; put its line into V3.orv.at of OLD as well, " +
+           exclude;
   }
-  return "NEW lacks it, and its OID leaves the files of OLD with another definition of the same OID, which NEW has; give it an OID of its own, " + exclude;
+  return "NEW lacks it, and its OID leaves the files of OLD with another definition of the same OID, which NEW has; give it an OID of its own, " +
+         exclude;
 }
 
 }  // namespace
@@ -37,8 +42,8 @@ void Rehearsal::run(const OidLists& lists) {
   }
 }
 
-// An object class or attribute type leaves the table keyed by name; a vendor extension goes only when
-// neither of them has the OID.
+// An object class or attribute type leaves the table keyed by name; a vendor extension goes only
+// when neither of them has the OID.
 void Rehearsal::withdraw(const std::set<std::string>& oids) {
   for (const std::string& oid : oids) {
     DefinitionKind kind = DefinitionKind::kVendorExtension;
@@ -90,10 +95,19 @@ void Rehearsal::replace(const Definition& moved, const Definition& named) {
   if (moved.kind != DefinitionKind::kVendorExtension) {
     const Definition* const going = m_new.lookUp(moved.kind, moved.oid);
     if (going != nullptr && going != &named) {
-      return refuse(moved, "NEW has the first name in " + describe(named) + " at " + placeOf(named) + " and the OID in " + describe(*going) + " at " + placeOf(*going) + ", which the merge would remove; make name and OID agree with NEW's, or list " + shown(moved.oid) + " in a file for --exclude-oids to keep what NEW has");
+      return refuse(
+          moved,
+          "NEW has the first name in " + describe(named) + " at " + placeOf(named) +
+              " and the OID in " + describe(*going) + " at " + placeOf(*going) +
+              ", which the merge would remove; make name and OID agree with NEW's, or list " +
+              shown(moved.oid) + " in a file for --exclude-oids to keep what NEW has");
     }
     if (named.oid != moved.oid) {
-      return refuse(moved, "NEW gives the first name to the OID " + shown(named.oid) + " at " + placeOf(named) + ", and the merge would lose OLD's; give it NEW's OID or a first name of its own, or list " + shown(moved.oid) + " in a file for --exclude-oids to keep what NEW has");
+      return refuse(
+          moved,
+          "NEW gives the first name to the OID " + shown(named.oid) + " at " + placeOf(named) +
+              ", and the merge would lose OLD's; give it NEW's OID or a first name of its own, or list " +
+              shown(moved.oid) + " in a file for --exclude-oids to keep what NEW has");
     }
     m_new.byOid(moved.kind)[moved.oid] = &moved;
   }
@@ -111,7 +125,11 @@ void Rehearsal::add(const Definition& moved) {
   if (moved.kind != DefinitionKind::kVendorExtension) {
     const Definition* const holder = m_new.atOid(moved.kind, moved.oid);
     if (holder != nullptr && holder->inventory != moved.inventory) {
-      return refuse(moved, "NEW gives the OID to " + describe(*holder) + " at " + placeOf(*holder) + ", and the merge would lose OLD's; give it NEW's first name or an OID of its own, or list " + shown(moved.oid) + " in a file for --exclude-oids to keep what NEW has");
+      return refuse(
+          moved,
+          "NEW gives the OID to " + describe(*holder) + " at " + placeOf(*holder) +
+              ", and the merge would lose OLD's; give it NEW's first name or an OID of its own, or list " +
+              shown(moved.oid) + " in a file for --exclude-oids to keep what NEW has");
     }
     m_new.byOid(moved.kind).try_emplace(moved.oid, &moved);
   }

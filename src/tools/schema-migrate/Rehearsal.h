@@ -1,6 +1,7 @@
 // A migration made on references to definitions, before it is made on the definitions: withdrawal,
 // comparison and merge as the library does them. What the merge could not do, or could do only by
-// losing a definition of OLD or removing another one of NEW, is a refusal, and is left out of the rest.
+// losing a definition of OLD or removing another one of NEW, is a refusal, and is left out of the
+// rest.
 
 #ifndef SCHEMA_MIGRATE_REHEARSAL_H
 #define SCHEMA_MIGRATE_REHEARSAL_H

@@ -7,8 +7,8 @@
 #include <cstddef>
 #include <string>
 
-// The first six are those whose OIDs comparison and merge maintain, in the order in which the library
-// searches them; the first seven have a set of OIDs and are written from it.
+// The first six are those whose OIDs comparison and merge maintain, in the order in which the
+// library searches them; the first seven have a set of OIDs and are written from it.
 constexpr std::array<const char*, 9> kSchemaFiles = {
     "V3.user.oc",   "V3.user.at",        "V3.orv.oc",    "V3.orv.at",    "V3.system.oc",
     "V3.system.at", "V3.modifiedschema", "V3.config.at", "V3.config.oc",

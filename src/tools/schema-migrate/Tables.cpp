@@ -74,10 +74,9 @@ std::vector<const Definition*> Tables::inOrder(DefinitionKind kind) const {
   for (const auto& entry : table) {
     definitions.push_back(entry.second);
   }
-  std::sort(definitions.begin(), definitions.end(),
-            [](const Definition* one, const Definition* other) {
-              return keyOf(*one) < keyOf(*other);
-            });
+  std::sort(
+      definitions.begin(), definitions.end(),
+      [](const Definition* one, const Definition* other) { return keyOf(*one) < keyOf(*other); });
   return definitions;
 }
 

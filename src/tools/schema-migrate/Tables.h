@@ -1,5 +1,6 @@
-// The tables and OID sets that a schema manager has after reading an installation, with references to
-// the inventory's definitions in place of its own. On them a run is worked out before it is made.
+// The tables and OID sets that a schema manager has after reading an installation, with references
+// to the inventory's definitions in place of its own. On them a run is worked out before it is
+// made.
 
 #ifndef SCHEMA_MIGRATE_TABLES_H
 #define SCHEMA_MIGRATE_TABLES_H
@@ -60,10 +61,14 @@ class Tables {
   // The definitions that are written for an OID: none, one, or an attribute type and its extension.
   std::array<const Definition*, 2> writtenFor(std::string_view oid) const;
 
-  // The definition of the same kind that came earlier in the reading under the same key, or the same
-  // OID, and for which this one was not entered there; null when it was entered.
-  const Definition* earlierByKey(const Definition& read) const { return m_earlier[read.index].byKey; }
-  const Definition* earlierByOid(const Definition& read) const { return m_earlier[read.index].byOid; }
+  // The definition of the same kind that came earlier in the reading under the same key, or the
+  // same OID, and for which this one was not entered there; null when it was entered.
+  const Definition* earlierByKey(const Definition& read) const {
+    return m_earlier[read.index].byKey;
+  }
+  const Definition* earlierByOid(const Definition& read) const {
+    return m_earlier[read.index].byOid;
+  }
 
  private:
   struct Earlier {

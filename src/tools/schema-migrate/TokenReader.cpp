@@ -122,22 +122,28 @@ bool TokenReader::skipToToken(char* c) {
 }
 
 int TokenReader::lexan() {
+  int token = TOKEN_END;
   char c = '\0';
-  if (m_isAtEnd || !skipToToken(&c)) {
+  if (!m_isAtEnd && skipToToken(&c)) {
+    m_position = {m_line, m_offset - m_lineStart};
+    token = readToken(c);
+  }
+  if (token == TOKEN_END) {
     m_position = {m_line, m_offset - m_lineStart + 1};
-    return TOKEN_END;
-  }
-  m_position = {m_line, m_offset - m_lineStart};
-  int token = static_cast<signed char>(c);
-  if (isDigit(c)) {
-    token = readNumber(c);
-  } else if (isLetter(c) || c == '\'' || c == '-') {
-    token = readWord(c);
-  }
-  if (token != TOKEN_END) {
+  } else {
     m_current = token;
   }
   return token;
+}
+
+int TokenReader::readToken(char c) {
+  if (isDigit(c)) {
+    return readNumber(c);
+  }
+  if (isLetter(c) || c == '\'' || c == '-') {
+    return readWord(c);
+  }
+  return static_cast<signed char>(c);
 }
 
 void TokenReader::match(int expected) {
@@ -201,8 +207,8 @@ int TokenReader::readWord(char c) {
   return lookUp(TOKEN_NAME);
 }
 
-// Quotes make no difference: a keyword in quotes is that keyword. A text that was stored last is the
-// token that it was then, so that 1.2 behind '1.2' is a name.
+// Quotes make no difference: a keyword in quotes is that keyword. A text that was stored last is
+// the token that it was then, so that 1.2 behind '1.2' is a name.
 int TokenReader::lookUp(int token) {
   m_textIsStored = false;
   if (m_hasStored && m_text == m_stored) {

@@ -1,6 +1,6 @@
-// The tokens of a schema file exactly as the library's lexical analyser returns them, with the place
-// where each begins. The library tells the line only, and not of every newline: hence a tokeniser of
-// its own here. It holds a buffer, and the texts of the last two words.
+// The tokens of a schema file exactly as the library's lexical analyser returns them, with the
+// place where each begins. The library tells the line only, and not of every newline: hence a
+// tokeniser of its own here. It holds a buffer, and the texts of the last two words.
 
 #ifndef SCHEMA_MIGRATE_TOKEN_READER_H
 #define SCHEMA_MIGRATE_TOKEN_READER_H
@@ -43,6 +43,7 @@ class TokenReader {
   bool read(char* c);
   void putBack();
   bool skipToToken(char* c);
+  int readToken(char c);
   int readNumber(char c);
   int readWord(char c);
   int lookUp(int token);

@@ -1,0 +1,111 @@
+#include "Report.h"
+
+#include <array>
+#include <cstdint>
+#include <cstdio>
+
+#include "Messages.h"
+#include "SchemaFiles.h"
+
+namespace {
+
+// As an administrator knows the files: the server's first, then the vendor's, then the user's.
+constexpr std::array<std::size_t, 9> kShownOrder = {5, 4, 3, 2, 1, 0, 6, 7, 8};
+
+struct Row {
+  std::uint64_t readOld = 0;
+  std::uint64_t readNew = 0;
+  std::uint64_t kept = 0;
+  std::uint64_t added = 0;
+  std::uint64_t replaced = 0;
+};
+
+Row rowOf(std::size_t file, const Inventory& oldOne, const Inventory& newOne, Plan* plan) {
+  Row row;
+  row.readOld = oldOne.countOf(file);
+  row.readNew = newOne.countOf(file);
+  if (file >= kWrittenFiles) {
+    row.kept = row.readNew;
+    return row;
+  }
+  for (const Definition* const definition : plan->contents(file)) {
+    switch (plan->fateOf(*definition)) {
+      case Fate::kAdded:
+        ++row.added;
+        break;
+      case Fate::kReplaces:
+        ++row.replaced;
+        break;
+      default:
+        ++row.kept;
+    }
+  }
+  return row;
+}
+
+std::string formatted(const std::string& name, const Row& row) {
+  std::array<char, 256> line{};
+  std::snprintf(
+      line.data(), line.size(), "%-18s%9llu%10llu%9llu%9llu%10llu%10llu\n", name.c_str(),
+      static_cast<unsigned long long>(row.readOld), static_cast<unsigned long long>(row.readNew),
+      static_cast<unsigned long long>(row.kept), static_cast<unsigned long long>(row.added),
+      static_cast<unsigned long long>(row.replaced),
+      static_cast<unsigned long long>(row.kept + row.added + row.replaced));
+  return line.data();
+}
+
+void addTo(Row* total, const Row& row) {
+  total->readOld += row.readOld;
+  total->readNew += row.readNew;
+  total->kept += row.kept;
+  total->added += row.added;
+  total->replaced += row.replaced;
+}
+
+std::string tableOf(const Inventory& oldOne, const Inventory& newOne, Plan* plan) {
+  std::string text =
+      "File               read OLD  read NEW     kept    added  replaced   written\n";
+  Row total;
+  for (const std::size_t file : kShownOrder) {
+    const Row row = rowOf(file, oldOne, newOne, plan);
+    if (file < kWrittenFiles || newOne.hasFile(file)) {
+      text += formatted(kSchemaFiles[file], row);
+    } else if (oldOne.hasFile(file)) {
+      text += formatted(std::string(kSchemaFiles[file]) + " (*)", row);
+    }
+    addTo(&total, row);
+  }
+  return text + formatted("Total", total);
+}
+
+std::string balanceOf(const Inventory& oldOne, const Balance& balance) {
+  std::string text = "Of OLD's " + counted(oldOne.definitions().size(), "definition") + ":\n";
+  const auto add = [&text](std::uint64_t count, const char* what) {
+    if (count != 0) {
+      text += "  " + std::to_string(count) + " " + what + "\n";
+    }
+  };
+  add(balance.same, "the same in NEW");
+  add(balance.added, "added to NEW's");
+  add(balance.replacing, "in the place of NEW's");
+  add(balance.excluded, "excluded");
+  add(balance.withdrawn, "withdrawn");
+  add(balance.repeated, "repeated, or superseded by V3.modifiedschema");
+  add(balance.notCarried, "lost; see the warnings");
+  return text;
+}
+
+}  // namespace
+
+std::string summaryOf(const Inventory& oldOne, const Inventory& newOne, Plan* plan) {
+  std::string text = tableOf(oldOne, newOne, plan);
+  for (std::size_t file = kWrittenFiles; file < kSchemaFiles.size(); ++file) {
+    if (newOne.hasFile(file)) {
+      text += std::string(kSchemaFiles[file]) + " is NEW's, unchanged.\n";
+    } else if (oldOne.hasFile(file)) {
+      text +=
+          "(*) NEW has no " + std::string(kSchemaFiles[file]) + ", and so the output has none.\n";
+    }
+  }
+  return text + balanceOf(oldOne, plan->balance());
+}
