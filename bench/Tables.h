@@ -1,0 +1,51 @@
+// The results as tables in Markdown.
+
+#ifndef LIBSCHEMA_BENCH_TABLES_H
+#define LIBSCHEMA_BENCH_TABLES_H
+
+#include <string>
+#include <vector>
+
+namespace bench {
+
+// One work on one input.
+struct RatioRow {
+  std::string work;
+  std::string input;
+  double seconds = 0;  // the library's
+  double definitionsPerSecond = 0;
+  double bytesPerSecond = 0;
+  double toPeer = 0;  // library / libldap; 0: no part in the work
+  double peerGoal = 0;
+  double toFloor = 0;
+  double floorGoal = 0;
+};
+
+struct MemoryRow {
+  std::string input;
+  double library = 0;  // bytes per definition
+  double floor = 0;
+  double ratio = 0;
+  double goal = 0;
+};
+
+struct GrowthRow {
+  std::string name;
+  std::size_t size = 0;
+  double seconds = 0;
+  double secondsOfFour = 0;
+  double exponent = 0;
+  double goal = 0;
+};
+
+struct Results {
+  std::vector<RatioRow> ratios;
+  std::vector<MemoryRow> memory;
+  std::vector<GrowthRow> growth;
+};
+
+std::string asMarkdown(const Results& results);
+
+}  // namespace bench
+
+#endif  // LIBSCHEMA_BENCH_TABLES_H
