@@ -9,41 +9,41 @@
 #include <iterator>
 #include <string>
 
-namespace libschema __attribute__((visibility("hidden"))) {
+namespace libschema {
 
-  template <typename Table>
-  class AscendingLookup {
-   public:
-    using Iterator = decltype(std::declval<Table&>().begin());
+template <typename Table>
+class AscendingLookup {
+ public:
+  using Iterator = decltype(std::declval<Table&>().begin());
 
-    explicit AscendingLookup(Table& table) : m_table(table), m_place(table.begin()) {}
+  explicit AscendingLookup(Table& table) : m_table(table), m_place(table.begin()) {}
 
-    // Returns the entry under `key`, or the table's end.
-    Iterator find(const std::string& key) {
-      const Iterator place = lowerBound(key);
-      return place != m_table.end() && place->first == key ? place : m_table.end();
-    }
+  // Returns the entry under `key`, or the table's end.
+  Iterator find(const std::string& key) {
+    const Iterator place = lowerBound(key);
+    return place != m_table.end() && place->first == key ? place : m_table.end();
+  }
 
-    // Returns the first entry that is not before `key`, or the table's end.
-    Iterator lowerBound(const std::string& key) {
-      constexpr int kSteps = 8;
-      if (m_place != m_table.begin() && !(std::prev(m_place)->first < key)) {
-        return m_place = m_table.lower_bound(key);
-      }
-      for (int step = 0; step < kSteps; ++step) {
-        if (m_place == m_table.end() || !(m_place->first < key)) {
-          return m_place;
-        }
-        ++m_place;
-      }
+  // Returns the first entry that is not before `key`, or the table's end.
+  Iterator lowerBound(const std::string& key) {
+    constexpr int kSteps = 8;
+    if (m_place != m_table.begin() && !(std::prev(m_place)->first < key)) {
       return m_place = m_table.lower_bound(key);
     }
+    for (int step = 0; step < kSteps; ++step) {
+      if (m_place == m_table.end() || !(m_place->first < key)) {
+        return m_place;
+      }
+      ++m_place;
+    }
+    return m_place = m_table.lower_bound(key);
+  }
 
-   private:
-    Table& m_table;
-    Iterator m_place;  // every entry before it is below the key looked up last
-  };
+ private:
+  Table& m_table;
+  Iterator m_place;  // every entry before it is below the key looked up last
+};
 
-}  // namespace )
+}  // namespace libschema
 
 #endif  // LIBSCHEMA_ASCENDING_LOOKUP_H

@@ -130,34 +130,26 @@ int Attribute::parseClause(SchemaLexan* lexer, int token) {
 
 // The order of the clauses, and every blank, belongs to the file format.
 void Attribute::composeLine(std::string* text) const {
-  text->append("attributetypes=( ").append(OID).append(" NAME ( ");
-  libschema::appendQuoted(names, text);
-  text->append(" ) ");
-  if (!description.empty()) {
-    text->append(" DESC '").append(description).append("' ");
-  }
-  if (isObsolete) {
-    text->append("OBSOLETE ");
-  }
+  constexpr std::size_t kLiterals = 200;
+  libschema::Line line(text, kLiterals + OID.size() + description.size() + equality.size() +
+                                 ordering.size() + substr.size() + syntax.size() + usage.size() +
+                                 libschema::Line::roomOf(names) +
+                                 libschema::Line::roomOf(superiors));
+  line.add("attributetypes=( ").add(OID).add(" NAME ( ").addQuoted(names).add(" ) ");
+  line.addValue(" DESC '", description, "' ");
+  line.addIf(isObsolete, "OBSOLETE ");
   if (!superiors.empty()) {
-    text->append("SUP ");
-    libschema::appendSpaced(superiors, text);
+    line.add("SUP ").addJoined(superiors, " ").add(" ");
   }
-  libschema::appendValue("EQUALITY ", equality, text);
-  libschema::appendValue("ORDERING ", ordering, text);
-  libschema::appendValue("SUBSTR ", substr, text);
-  libschema::appendValue("SYNTAX ", syntax, text);
-  if (singleValue == KEY_SINGLE_VALUE) {
-    text->append("SINGLE-VALUE ");
-  }
-  if (isCollective) {
-    text->append("COLLECTIVE ");
-  }
-  if (!isUserModifiable) {
-    text->append("NO-USER-MODIFICATION ");
-  }
-  libschema::appendValue("USAGE ", usage, text);
-  text->append(" )\n");
+  line.addValue("EQUALITY ", equality);
+  line.addValue("ORDERING ", ordering);
+  line.addValue("SUBSTR ", substr);
+  line.addValue("SYNTAX ", syntax);
+  line.addIf(singleValue == KEY_SINGLE_VALUE, "SINGLE-VALUE ");
+  line.addIf(isCollective, "COLLECTIVE ");
+  line.addIf(!isUserModifiable, "NO-USER-MODIFICATION ");
+  line.addValue("USAGE ", usage);
+  line.add(" )\n");
 }
 
 void Attribute::appendLine(std::string* text) const {

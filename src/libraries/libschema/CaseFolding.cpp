@@ -28,13 +28,19 @@ std::string lowered(std::string text) {
   return text;
 }
 
-bool isLowered(const std::string& text) {
-  return std::all_of(text.begin(), text.end(), [](char c) { return lower(c) == c; });
+bool isLoweredFormOf(const std::string& folded, const std::string& text) {
+  return folded.size() == text.size() &&
+         std::equal(folded.begin(), folded.end(), text.begin(),
+                    [](char f, char t) { return lower(f) == f && (f == t || lower(t) == f); });
 }
 
 bool hasPartners(const std::vector<std::string>& mine, const std::vector<std::string>& theirs) {
   constexpr std::size_t kShort = 12;
   if (theirs.size() <= kShort) {
+    // Equal lists have the partners at the same places.
+    if (mine == theirs) {
+      return true;
+    }
     return std::all_of(mine.begin(), mine.end(), [&](const std::string& member) {
       return std::any_of(theirs.begin(), theirs.end(),
                          [&](const std::string& other) { return equalLowered(member, other); });

@@ -7,18 +7,18 @@
 #include <string>
 #include <vector>
 
-namespace libschema __attribute__((visibility("hidden"))) {
+namespace libschema {
 
-  // Returns `text` with every character passed through tolower.
-  std::string lowered(std::string text);
+// Returns `text` with every character passed through tolower.
+std::string lowered(std::string text);
 
-  // True when lowered(text) == text.
-  bool isLowered(const std::string& text);
+// True when lowered(text) == folded and lowered(folded) == folded.
+bool isLoweredFormOf(const std::string& folded, const std::string& text);
 
-  // True when every member of `mine` has a partner in `theirs` with the same lower-case form. The
-  // test goes one way: several members may share a partner.
-  bool hasPartners(const std::vector<std::string>& mine, const std::vector<std::string>& theirs);
+// True when every member of `mine` has a partner in `theirs` with the same lower-case form. The
+// test goes one way: several members may share a partner.
+bool hasPartners(const std::vector<std::string>& mine, const std::vector<std::string>& theirs);
 
-}  // namespace )
+}  // namespace libschema
 
 #endif  // LIBSCHEMA_CASE_FOLDING_H

@@ -14,7 +14,7 @@ std::string textOf(SchemaLexan* lexer) {
 
 int readValue(SchemaLexan* lexer, TokenSet accepted, std::string* value) {
   if (isOneOf(lexer->lexan(), accepted)) {
-    *value = textOf(lexer);
+    lexer->getStringValue(lexer->getTokenValIndex(), *value);
   }
   return lexer->lexan();
 }
@@ -66,12 +66,6 @@ void DistinctNames::add(std::string name) {
   }
 }
 
-void appendQuoted(const std::vector<std::string>& values, std::string* text) {
-  for (const std::string& value : values) {
-    text->append("'").append(value).append("' ");
-  }
-}
-
 void appendSpaced(const std::vector<std::string>& values, std::string* text) {
   for (const std::string& value : values) {
     text->append(value).append(" ");
@@ -87,12 +81,6 @@ void appendJoined(const std::vector<std::string>& values, std::string_view separ
     }
     isFirst = false;
     text->append(value);
-  }
-}
-
-void appendValue(std::string_view keyword, const std::string& value, std::string* text) {
-  if (!value.empty()) {
-    text->append(keyword).append(value).append(" ");
   }
 }
 

@@ -118,22 +118,23 @@ int ORVAttribute::parseDatabaseNames(SchemaLexan* lexer, bool* isComplete) {
 
 // The order of the clauses, and every blank, belongs to the file format.
 void ORVAttribute::composeLine(std::string* text) const {
-  text->append("ORVAttributetypes=( ").append(OID).append(" ");
+  constexpr std::size_t kLiterals = 130;
+  libschema::Line line(text, kLiterals + OID.size() + access.size() + length.size() +
+                                 libschema::Line::roomOf(dbNames));
+  line.add("ORVAttributetypes=( ").add(OID).add(" ");
   if (!dbNames.empty()) {
-    text->append("DBNAME ( ");
-    libschema::appendQuoted(dbNames, text);
-    text->append(" ) ");
+    line.add("DBNAME ( ").addQuoted(dbNames).add(" ) ");
   }
-  libschema::appendValue("ACCESS-CLASS ", access, text);
+  line.addValue("ACCESS-CLASS ", access);
   if (length != kNoLength) {
-    text->append("LENGTH ").append(length).append(" ");
+    line.add("LENGTH ").add(length).add(" ");
   }
-  text->append(equality ? "EQUALITY " : "");
-  text->append(ordering ? "ORDERING " : "");
-  text->append(substr ? "SUBSTR " : "");
-  text->append(approx ? "APPROX " : "");
-  text->append(reverse ? "REVERSE " : "");
-  text->append(")\n");
+  line.addIf(equality, "EQUALITY ");
+  line.addIf(ordering, "ORDERING ");
+  line.addIf(substr, "SUBSTR ");
+  line.addIf(approx, "APPROX ");
+  line.addIf(reverse, "REVERSE ");
+  line.add(")\n");
 }
 
 void ORVAttribute::appendLine(std::string* text) const {

@@ -73,11 +73,9 @@ const char* kindName(int structuralType) {
   }
 }
 
-void appendList(const char* keyword, const std::vector<std::string>& values, std::string* text) {
+void addList(const char* opening, const std::vector<std::string>& values, libschema::Line* line) {
   if (!values.empty()) {
-    text->append(keyword).append("( ");
-    libschema::appendJoined(values, " $ ", text);
-    text->append(" ) ");
+    line->add(opening).addJoined(values, " $ ").add(" ) ");
   }
 }
 
@@ -139,21 +137,21 @@ int ObjectClass::parseClause(SchemaLexan* lexer, int token) {
 
 // The order of the clauses, and every blank, belongs to the file format.
 void ObjectClass::composeLine(std::string* text) const {
-  text->append("objectclasses=( ").append(OID);
-  text->append(names.size() > 1 ? " NAME ( " : " NAME ");
-  libschema::appendQuoted(names, text);
-  text->append(names.size() > 1 ? " ) " : "");
-  if (!description.empty()) {
-    text->append(" DESC '").append(description).append("' ");
-  }
-  if (obsolete) {
-    text->append("OBSOLETE ");
-  }
-  appendList("SUP ", superiors, text);
-  text->append(kindName(structuralType)).append(" ");
-  appendList("MUST ", reqAttrs, text);
-  appendList("MAY ", optAttrs, text);
-  text->append(")\n");
+  constexpr std::size_t kLiterals = 120;
+  libschema::Line line(
+      text, kLiterals + OID.size() + description.size() + libschema::Line::roomOf(names) +
+                libschema::Line::roomOf(superiors) + libschema::Line::roomOf(reqAttrs) +
+                libschema::Line::roomOf(optAttrs));
+  const bool isList = names.size() > 1;
+  line.add("objectclasses=( ").add(OID).add(isList ? " NAME ( " : " NAME ");
+  line.addQuoted(names).addIf(isList, " ) ");
+  line.addValue(" DESC '", description, "' ");
+  line.addIf(obsolete, "OBSOLETE ");
+  addList("SUP ( ", superiors, &line);
+  line.add(kindName(structuralType)).add(" ");
+  addList("MUST ( ", reqAttrs, &line);
+  addList("MAY ( ", optAttrs, &line);
+  line.add(")\n");
 }
 
 void ObjectClass::appendLine(std::string* text) const {

@@ -1,226 +1,15 @@
 #include "SchemaLexan.h"
 
-#include <array>
 #include <clocale>
 #include <ios>
-#include <streambuf>
 #include <utility>
 
+#include "TokenScanner.h"
 #include "TracePoints.h"
 
+using libschema::Scanned;
+
 namespace {
-
-// What a byte may be part of, in the "C" locale. Bytes of 128 and more are of no class.
-enum ByteClass : unsigned char {
-  kDigit = 1,        // 0 to 9
-  kNumberPart = 2,   // a digit or "."
-  kWordStart = 4,    // a letter, "'" or "-"
-  kWordPart = 8,     // a letter, a digit, "_", "-" or a TAB
-  kQuotedPart = 16,  // what a word takes, a blank, and any punctuation but "'"
-  kBlank = 32,       // a blank or a TAB
-  kCommentPart = 64  // anything but a newline
-};
-
-constexpr std::array<unsigned char, 256> classifyBytes() {
-  std::array<unsigned char, 256> classes{};
-  for (int c = 0; c < 256; ++c) {
-    const bool digit = c >= '0' && c <= '9';
-    const bool letter = (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z');
-    const bool punctuation = c > ' ' && c < 127 && !digit && !letter;
-    const bool word = letter || digit || c == '_' || c == '-' || c == '\t';
-    classes[static_cast<std::size_t>(c)] = static_cast<unsigned char>(
-        (digit ? kDigit : 0) | (digit || c == '.' ? kNumberPart : 0) |
-        (letter || c == '\'' || c == '-' ? kWordStart : 0) | (word ? kWordPart : 0) |
-        (word || c == ' ' || (punctuation && c != '\'') ? kQuotedPart : 0) |
-        (c == ' ' || c == '\t' ? kBlank : 0) | (c != '\n' ? kCommentPart : 0));
-  }
-  return classes;
-}
-
-constexpr std::array<unsigned char, 256> kClasses = classifyBytes();
-
-bool isOf(char c, ByteClass byteClass) {
-  return (kClasses[static_cast<unsigned char>(c)] & byteClass) != 0;
-}
-
-// The protected members of a stream buffer, by name.
-struct BufferAccess : std::streambuf {
-  static const char* next(const std::streambuf& buffer) { return (buffer.*&BufferAccess::gptr)(); }
-  static const char* end(const std::streambuf& buffer) { return (buffer.*&BufferAccess::egptr)(); }
-  static void advance(std::streambuf* buffer, int count) { (buffer->*&BufferAccess::gbump)(count); }
-};
-
-// Reads the characters of one token in place, in the buffer of the input stream, and gathers the
-// token's text. A read that fails leaves the character as it was and the stream at end of file (or,
-// after an input error, bad); every later read fails too. The stream stands behind what was read
-// once the scanner is gone.
-class Scanner {
- public:
-  explicit Scanner(std::ifstream* input) : m_input(input), m_buffer(input->rdbuf()) {
-    if (m_input->good()) {
-      takeWindow();
-    }
-  }
-  Scanner(const Scanner&) = delete;
-  Scanner& operator=(const Scanner&) = delete;
-  ~Scanner() { giveBack(); }
-
-  char current() const { return m_current; }
-  bool atEnd() const { return m_input->eof(); }
-
-  // Reads one character; false when there is none.
-  bool read() {
-    if (m_next == m_end && !refill()) {
-      return false;
-    }
-    m_current = *m_next++;
-    return true;
-  }
-
-  // Puts the current character back, unless the last read failed.
-  void putBack() {
-    if (m_input->good()) {
-      --m_next;
-    }
-  }
-
-  // Passes over characters of the class, from the one read last on; false when the input ends
-  // there.
-  bool skipRun(ByteClass byteClass) {
-    while (isOf(m_current, byteClass)) {
-      m_next = endOfRun(byteClass);
-      if (!read()) {
-        return false;
-      }
-    }
-    return true;
-  }
-
-  // Passes over the characters of the class that lie ahead in the window.
-  void passRun(ByteClass byteClass) { m_next = endOfRun(byteClass); }
-
-  // Passes over characters of the class like skipRun, appending them to the text.
-  bool takeRun(ByteClass byteClass) {
-    while (isOf(m_current, byteClass)) {
-      const char* const start = m_next - 1;
-      m_next = endOfRun(byteClass);
-      append(start, m_next);
-      if (!read()) {
-        return false;
-      }
-    }
-    return true;
-  }
-
-  // Appends the current character to the text and reads on.
-  bool take() {
-    append(m_next - 1, m_next);
-    return read();
-  }
-
-  // The text gathered so far; valid until the scanner reads on or goes.
-  std::string_view text() const { return m_isKept ? std::string_view(m_kept) : m_text; }
-
- private:
-  void takeWindow() {
-    m_start = m_next = BufferAccess::next(*m_buffer);
-    m_end = BufferAccess::end(*m_buffer);
-  }
-
-  // The first character of the window, from the next one on, that is not of the class.
-  const char* endOfRun(ByteClass byteClass) const {
-    const char* place = m_next;
-    const char* const end = m_end;
-    while (place != end && isOf(*place, byteClass)) {
-      ++place;
-    }
-    return place;
-  }
-
-  void giveBack() { BufferAccess::advance(m_buffer, static_cast<int>(m_next - m_start)); }
-
-  bool refill() {
-    if (!m_input->good()) {
-      return false;
-    }
-    keepText();
-    giveBack();
-    m_start = m_next = m_end = nullptr;
-    try {
-      if (m_buffer->sgetc() == std::char_traits<char>::eof()) {
-        m_input->setstate(std::ios_base::eofbit | std::ios_base::failbit);
-        return false;
-      }
-    } catch (...) {
-      m_input->setstate(std::ios_base::badbit);
-      return false;
-    }
-    takeWindow();
-    return true;
-  }
-
-  // The text is a piece of the window as long as it is contiguous, and a copy from then on.
-  void append(const char* from, const char* to) {
-    const auto count = static_cast<std::size_t>(to - from);
-    if (!m_isKept && m_text.empty()) {
-      m_text = std::string_view(from, count);
-    } else if (!m_isKept && m_text.data() + m_text.size() == from) {
-      m_text = std::string_view(m_text.data(), m_text.size() + count);
-    } else {
-      keepText();
-      m_kept.append(from, count);
-    }
-  }
-
-  void keepText() {
-    if (!m_isKept) {
-      m_kept.assign(m_text);
-      m_isKept = true;
-    }
-  }
-
-  std::ifstream* m_input;
-  std::streambuf* m_buffer;
-  const char* m_start = nullptr;
-  const char* m_next = nullptr;
-  const char* m_end = nullptr;
-  char m_current = '\0';
-  bool m_isKept = false;
-  std::string_view m_text;
-  std::string m_kept;
-};
-
-// Reads a number from its first digit on; leaves the character after it current. Returns the code.
-int scanNumber(Scanner* scanner) {
-  scanner->takeRun(kNumberPart);
-  while (scanner->current() == ' ' && scanner->read()) {
-  }
-  if (scanner->atEnd() || scanner->current() != '{') {
-    return TOKEN_NUMBER;
-  }
-  scanner->take();
-  if (!isOf(scanner->current(), kDigit)) {
-    return TOKEN_NUMBER_BAD_LENGTH;
-  }
-  scanner->takeRun(kDigit);
-  if (scanner->current() != '}') {
-    return TOKEN_NUMBER_BAD_LENGTH;
-  }
-  scanner->take();
-  return TOKEN_NUMBER_LENGTH;
-}
-
-// Reads a word or a quoted string; leaves the character after it current. Whatever ends a quoted
-// string, its closing quote or not, is dropped, and a newline dropped so is not counted.
-void scanWord(Scanner* scanner) {
-  if (scanner->current() != '\'') {
-    scanner->takeRun(kWordPart);
-    return;
-  }
-  scanner->read();
-  scanner->takeRun(kQuotedPart);
-  scanner->read();
-}
 
 // The keyword that a spelling of a definition's start stands for; empty for any other text.
 std::string_view foldStart(std::string_view text) {
@@ -290,64 +79,55 @@ int SchemaLexan::nextToken() {
   if (m_input.eof()) {
     return TOKEN_END;
   }
-  Scanner scanner(&m_input);
-  for (;;) {
-    if (!scanner.read()) {
+  int token = TOKEN_END;
+  if (m_input.good()) {
+    // Nearly every token lies in the stream's buffer as a whole.
+    libschema::BufferedInput buffered(*m_input.rdbuf());
+    int lineNumber = m_line_num;
+    const Scanned scanned = libschema::scanToken(&buffered, &lineNumber, &token);
+    if (!buffered.isShort()) {
+      buffered.advance(m_input.rdbuf());
+      m_line_num = lineNumber;
+      return takeToken(scanned == Scanned::kText, buffered.text(), true, token);
+    }
+  }
+  libschema::StreamInput input(&m_input, m_symtable);
+  switch (libschema::scanToken(&input, &m_line_num, &token)) {
+    case Scanned::kEndBetweenTokens:
       m_tokenvalindex = -1;
       return TOKEN_END;
-    }
-    const char c = scanner.current();
-    if (isOf(c, kBlank)) {
-      scanner.passRun(kBlank);
-      continue;
-    }
-    if (c == '\n') {
-      ++m_line_num;
-      continue;
-    }
-    if (c == '#') {
-      // The end of the file ends the last comment and counts as its line end.
-      scanner.skipRun(kCommentPart);
-      ++m_line_num;
-      continue;
-    }
-    if (isOf(c, kDigit)) {
-      const int token = scanNumber(&scanner);
-      if (scanner.atEnd()) {
-        return TOKEN_END;
-      }
-      scanner.putBack();
-      return storeText(scanner.text(), token);
-    }
-    if (isOf(c, kWordStart)) {
-      scanWord(&scanner);
-      if (scanner.atEnd()) {
-        return TOKEN_END;
-      }
-      scanner.putBack();
-      return storeText(scanner.text(), TOKEN_NAME);
-    }
-    m_tokenvalindex = -1;
-    m_lookahead = c;
-    return m_lookahead;
+    case Scanned::kEndWithinToken:
+      return TOKEN_END;
+    case Scanned::kCharacter:
+      return takeToken(false, {}, false, token);
+    case Scanned::kText:
+      break;
   }
+  return takeToken(true, input.text(), input.isTextInBuffer(), token);
 }
 
-// Makes `text` the current token. The scratch entry takes part in the look-up: a text equal to the
-// one stored before is that entry, with the code that it had then.
-int SchemaLexan::storeText(std::string_view text, int token) {
-  int index = m_symtable->findText(text);
-  if (index < 0 && token == TOKEN_NAME) {
-    const std::string_view keyword = foldStart(text);
-    index = keyword.empty() ? -1 : m_symtable->findText(keyword);
-  }
-  if (index < 0) {
-    m_symtable->removeValue(m_scratch_index);
-    index = m_scratch_index = m_symtable->insertText(text, token, false);
+// Makes a character, or a text, the current token. The scratch entry takes part in the look-up of a
+// text: one equal to the text stored before is that entry, with the code that it had then. A text
+// in the stream's buffer is not copied to the table as long as it stays there.
+int SchemaLexan::takeToken(bool hasText, std::string_view text, bool isInBuffer, int token) {
+  int index = -1;
+  if (hasText) {
+    index = m_symtable->findText(text);
+    if (index < 0 && token == TOKEN_NAME) {
+      const std::string_view keyword = foldStart(text);
+      index = keyword.empty() ? -1 : m_symtable->findText(keyword);
+    }
+    if (index < 0) {
+      index = isInBuffer ? m_symtable->replaceBorrowed(m_scratch_index, text, token)
+                         : m_symtable->replaceText(m_scratch_index, text, token);
+      m_scratch_index = index;
+    } else {
+      token = m_symtable->getTokenValue(index);
+    }
   }
   m_tokenvalindex = index;
-  m_lookahead = m_symtable->getTokenValue(index);
-  return m_lookahead;
+  m_lookahead = token;
+  return token;
 }
 
 void SchemaLexan::match(int expected) {

@@ -69,7 +69,7 @@ class SchemaLexan : public Clex_analyzer {
 
  private:
   int nextToken();
-  int storeText(std::string_view text, int token);
+  int takeToken(bool hasText, std::string_view text, bool isInBuffer, int token);
 };
 
 #endif  // LIBSCHEMA_SCHEMA_LEXAN_H

@@ -25,15 +25,41 @@ struct SchemaManager::Operations {
   template <typename Definition>
   using Iterator = typename Table<Definition>::iterator;
 
-  // The answer of the kind's look-up to the key of `entry`, asked of the manager that holds it.
+  // A definition met on a walk over a table: what the kind's look-up finds under the key of the
+  // entry, and the key that this definition gives, which is the entry's own unless the locale has
+  // changed.
   template <typename Definition>
-  static const Definition& definitionAt(const SchemaManager& manager,
-                                        const typename Table<Definition>::value_type& entry) {
-    if (!Kind<Definition>::takesAsItIs(entry.first)) {
-      return orNew(Kind<Definition>::lookUp(manager, std::string(entry.first)));
+  struct Met {
+    const Definition& definition;
+    const std::string& key;
+    bool isOwnKey;
+  };
+
+  // `buffer` is the place for a key that differs from the entry's.
+  template <typename Definition>
+  static Met<Definition> meet(const SchemaManager& manager,
+                              const typename Table<Definition>::value_type& entry,
+                              std::string* buffer) {
+    using Rules = Kind<Definition>;
+    if (Rules::isKeyOf(entry.first, *entry.second)) {
+      typename Rules::LookUp trace;
+      return {*entry.second, Rules::keyAt(entry), true};
     }
+    const Definition& definition = orNew(Rules::lookUp(manager, std::string(entry.first)));
+    *buffer = Rules::keyOf(definition);
+    return {definition, *buffer, false};
+  }
+
+  // A look-up whose answer is known already.
+  template <typename Definition>
+  static const Definition* answerOf(const Definition* definition) {
     typename Kind<Definition>::LookUp trace;
-    return *entry.second;
+    return definition;
+  }
+
+  static bool isFirstNameLower(const std::string& key, const ORVSchema& definition) {
+    const std::vector<std::string>& names = definition.namesInPlace();
+    return names.empty() ? key.empty() : libschema::isLoweredFormOf(key, names.front());
   }
 
   // An absent definition reads as a newly constructed one.
@@ -57,6 +83,10 @@ struct SchemaManager::Operations {
     }
 
     void apply(Table<Definition>* table) const {
+      if (m_entries.size() == table->size()) {
+        table->clear();
+        return;
+      }
       for (const auto& entry : m_entries) {
         table->erase(entry);
       }
@@ -107,12 +137,14 @@ struct SchemaManager::Operations::Kind<Attribute> {
   static constexpr bool kPrunesOidTable = true;
   static constexpr Table SchemaManager::*kTable = &SchemaManager::attrTable;
   static constexpr OidTable<Attribute> SchemaManager::*kOidTable = &SchemaManager::attrOidTable;
-  // False for a key whose letter case the look-up changes.
-  static bool takesAsItIs(const std::string& key) { return libschema::isLowered(key); }
   static const Attribute* lookUp(const SchemaManager& manager, const std::string& key) {
     return manager.lookUpAttr(key);
   }
   static std::string keyOf(const Attribute& definition) { return definition.getFirstNameLower(); }
+  static bool isKeyOf(const std::string& key, const Attribute& definition) {
+    return isFirstNameLower(key, definition);
+  }
+  static const std::string& keyAt(const Table::value_type& entry) { return entry.first; }
   static bool areEqual(const Attribute& mine, const Attribute& theirs) {
     return mine.attrsEqual(theirs) != 0;
   }
@@ -126,11 +158,14 @@ struct SchemaManager::Operations::Kind<ObjectClass> {
   static constexpr bool kPrunesOidTable = false;
   static constexpr Table SchemaManager::*kTable = &SchemaManager::ocTable;
   static constexpr OidTable<ObjectClass> SchemaManager::*kOidTable = &SchemaManager::ocOidTable;
-  static bool takesAsItIs(const std::string& /*key*/) { return true; }
   static const ObjectClass* lookUp(const SchemaManager& manager, const std::string& key) {
     return manager.lookUpObjClass(key);
   }
   static std::string keyOf(const ObjectClass& definition) { return definition.getFirstNameLower(); }
+  static bool isKeyOf(const std::string& key, const ObjectClass& definition) {
+    return isFirstNameLower(key, definition);
+  }
+  static const std::string& keyAt(const Table::value_type& entry) { return entry.first; }
   static bool areEqual(const ObjectClass& mine, const ObjectClass& theirs) {
     return mine.objsEqual(theirs);
   }
@@ -144,12 +179,15 @@ struct SchemaManager::Operations::Kind<ORVAttribute> {
   static constexpr bool kHasFileSet = false;
   static constexpr bool kPrunesOidTable = false;
   static constexpr Table SchemaManager::*kTable = &SchemaManager::orvAttrTable;
-  static bool takesAsItIs(std::string_view /*key*/) { return true; }
   static const ORVAttribute* lookUp(const SchemaManager& manager, const std::string& key) {
     return manager.lookUpORVAttr(key);
   }
   static const std::string& keyOf(const ORVAttribute& definition) {
     return definition.oidInPlace();
+  }
+  static bool isKeyOf(std::string_view /*key*/, const ORVAttribute& /*definition*/) { return true; }
+  static const std::string& keyAt(const Table::value_type& entry) {
+    return entry.second->oidInPlace();
   }
   static bool areEqual(const ORVAttribute& mine, const ORVAttribute& theirs) {
     return mine.orvAttrsEqual(theirs);
@@ -167,14 +205,14 @@ void SchemaManager::Operations::compare(SchemaManager* self, SchemaManager* refe
   Table<Definition>& references = reference->*Rules::kTable;
   AscendingLookup<Table<Definition>> inReference(references);
   Erasures<Definition> dropped;
+  std::string buffer;
   for (auto entry = table.begin(); entry != table.end(); ++entry) {
-    const Definition& mine = definitionAt<Definition>(*self, *entry);
-    const auto& key = Rules::keyOf(mine);
+    const auto& [mine, key, isOwnKey] = meet<Definition>(*self, *entry, &buffer);
     const auto found = inReference.find(key);
     const Definition* theirs = nullptr;
     if (found != references.end()) {
-      theirs = entry->first == key ? &definitionAt<Definition>(*reference, *found)
-                                   : &orNew(Rules::lookUp(*reference, std::string(entry->first)));
+      theirs = isOwnKey ? answerOf<Definition>(found->second)
+                        : &orNew(Rules::lookUp(*reference, std::string(entry->first)));
     }
     const std::string& oid = mine.oidInPlace();
     if (!self->excludes(oid) && (theirs == nullptr || !Rules::areEqual(mine, *theirs))) {
@@ -270,7 +308,11 @@ void SchemaManager::Operations::eraseMoved(SchemaManager* source) {
   Table<Definition>& table = source->*Rules::kTable;
   Erasures<Definition> moved;
   for (auto entry = table.begin(); entry != table.end(); ++entry) {
-    moved.add(entry, Rules::keyOf(*entry->second));
+    if (Rules::isKeyOf(entry->first, *entry->second)) {
+      moved.add(entry, Rules::keyAt(*entry));
+    } else {
+      moved.add(entry, Rules::keyOf(*entry->second));
+    }
     if constexpr (Rules::kHasFileSet) {
       (source->*Rules::kOidTable).erase(entry->second->oidInPlace());
     }
@@ -363,9 +405,10 @@ void SchemaManager::Operations::check(SchemaManager* self, SchemaManager* refere
   AscendingLookup<Table<Definition>> inReference(references);
   Erasures<Definition> dropped;
   std::vector<const std::string*> collidingOids;
+  std::string buffer;
   for (auto entry = table.begin(); entry != table.end(); ++entry) {
-    const Definition& mine = definitionAt<Definition>(*self, *entry);
-    const auto& key = Rules::keyOf(mine);
+    const auto& [mine, key, isOwnKey] = meet<Definition>(*self, *entry, &buffer);
+    static_cast<void>(isOwnKey);
     const std::string& oid = mine.oidInPlace();
     if (inReference.find(key) == references.end() && !isKey(*reference, oid)) {
       dropped.add(entry, key);

@@ -6,23 +6,6 @@ CSymbolTable::CSymbolTable() { m_buckets.fill(-1); }
 
 CSymbolTable::~CSymbolTable() = default;
 
-std::size_t CSymbolTable::bucketOf(std::string_view text) {
-  if (text.empty()) {
-    return 0;
-  }
-  const auto first = static_cast<unsigned char>(text.front());
-  const auto last = static_cast<unsigned char>(text.back());
-  return (text.size() * 7 + first * 3U + last) % kBuckets;
-}
-
-const CSymbolTable::Entry* CSymbolTable::entryAt(int index) const {
-  if (index < 0 || static_cast<std::size_t>(index) >= m_used) {
-    return nullptr;
-  }
-  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  return entry.kind == Kind::kNone ? nullptr : &entry;
-}
-
 CSymbolTable::Entry* CSymbolTable::appendEntry(Kind kind, int token, bool isKeyword) {
   if (m_used == m_entries.size()) {
     m_entries.emplace_back();
@@ -32,13 +15,14 @@ CSymbolTable::Entry* CSymbolTable::appendEntry(Kind kind, int token, bool isKeyw
   entry->isKeyword = isKeyword;
   entry->token = token;
   entry->next = -1;
+  entry->borrowed = {};
   return entry;
 }
 
 // Puts the entry last in its bucket, so that a look-up meets the lowest index first.
 void CSymbolTable::link(int index) {
   Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  entry.bucket = bucketOf(entry.text);
+  entry.bucket = bucketOf(entry.text());
   int* place = &m_buckets[entry.bucket];
   while (*place >= 0) {
     place = &m_entries[static_cast<std::size_t>(*place)].next;
@@ -62,7 +46,7 @@ int CSymbolTable::insertValue(std::string value, int token, bool isKeyword) {
 int CSymbolTable::insertText(std::string_view text, int token, bool isKeyword) {
   Entry* entry = appendEntry(Kind::kNone, token, isKeyword);
   try {
-    entry->text.assign(text);
+    entry->kept.assign(text);
   } catch (...) {
     --m_used;
     throw;
@@ -73,37 +57,48 @@ int CSymbolTable::insertText(std::string_view text, int token, bool isKeyword) {
   return index;
 }
 
+int CSymbolTable::replaceText(int index, std::string_view text, int token) {
+  removeValue(index);
+  return insertText(text, token, false);
+}
+
+int CSymbolTable::replaceBorrowed(int index, std::string_view text, int token) {
+  if (text.empty()) {
+    return replaceText(index, text, token);
+  }
+  if (index >= 0 && index == m_borrower && index + 1 == static_cast<int>(m_used)) {
+    // The usual case: the last entry borrows one text after the other.
+    Entry& entry = m_entries[static_cast<std::size_t>(index)];
+    unlink(index);
+    entry.borrowed = text;
+    entry.token = token;
+    entry.next = -1;
+    link(index);
+    return index;
+  }
+  removeValue(index);
+  keepBorrowed();
+  appendEntry(Kind::kString, token, false)->borrowed = text;
+  m_borrower = static_cast<int>(m_used) - 1;
+  link(m_borrower);
+  return m_borrower;
+}
+
+void CSymbolTable::keepBorrowed() {
+  if (m_borrower >= 0) {
+    Entry& entry = m_entries[static_cast<std::size_t>(m_borrower)];
+    entry.kept.assign(entry.borrowed);
+    entry.borrowed = {};
+    m_borrower = -1;
+  }
+}
+
 int CSymbolTable::insertValue(char value, int token, bool isKeyword) {
   appendEntry(Kind::kCharacter, token, isKeyword)->character = value;
   return static_cast<int>(m_used) - 1;
 }
 
 int CSymbolTable::lookUpValue(std::string value) { return findText(value); }
-
-int CSymbolTable::findText(std::string_view text) const {
-  int index = m_buckets[bucketOf(text)];
-  while (index >= 0) {
-    const Entry& entry = m_entries[static_cast<std::size_t>(index)];
-    if (entry.text == text) {
-      return index;
-    }
-    index = entry.next;
-  }
-  return -1;
-}
-
-int CSymbolTable::getTokenValue(int index) {
-  const Entry* entry = entryAt(index);
-  return entry == nullptr ? -1 : entry->token;
-}
-
-bool CSymbolTable::getValue(int index, std::string& out) {
-  if (!isString(index)) {
-    return false;
-  }
-  out = entryAt(index)->text;
-  return true;
-}
 
 bool CSymbolTable::getValue(int index, char& out) {
   if (!isCharacter(index)) {
@@ -131,7 +126,11 @@ void CSymbolTable::removeValue(int index) {
   if (entry.kind == Kind::kString) {
     unlink(index);
   }
+  if (index == m_borrower) {
+    m_borrower = -1;
+  }
   entry.kind = Kind::kNone;
+  entry.borrowed = {};
   ++m_holes;
   while (m_used > 0 && m_entries[m_used - 1].kind == Kind::kNone) {
     --m_used;
@@ -157,7 +156,7 @@ std::string CSymbolTable::describe(std::size_t index) const {
   const Entry& entry = m_entries[index];
   std::string line = std::to_string(index) + ' ' + std::to_string(entry.token) + ' ';
   if (entry.kind == Kind::kString) {
-    line += '"' + entry.text + '"';
+    line.append(1, '"').append(entry.text()).append(1, '"');
   } else {
     line += std::string("'") + entry.character + "'";
   }

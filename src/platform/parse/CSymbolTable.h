@@ -61,6 +61,13 @@ class CSymbolTable {
   int findText(std::string_view text) const;
   int insertText(std::string_view text, int token, bool isKeyword);
 
+  // Removes the entry `index` and adds a string entry, not as a keyword; returns the new index. A
+  // borrowed text is not copied: it must stay where it is until the entry goes or keepBorrowed()
+  // has copied it. One text at a time is borrowed.
+  int replaceText(int index, std::string_view text, int token);
+  int replaceBorrowed(int index, std::string_view text, int token);
+  void keepBorrowed();
+
  private:
   enum class Kind { kNone, kString, kCharacter };
   struct Entry {
@@ -68,9 +75,14 @@ class CSymbolTable {
     bool isKeyword = false;
     char character = '\0';
     int token = -1;
-    std::size_t bucket = 0;
     int next = -1;  // the next string entry in the same bucket
-    std::string text;
+    std::size_t bucket = 0;
+    std::string_view borrowed;  // the text, unless its data is null
+    std::string kept;
+
+    std::string_view text() const {
+      return borrowed.data() != nullptr ? borrowed : std::string_view(kept);
+    }
   };
 
   static constexpr std::size_t kBuckets = 128;
@@ -85,7 +97,56 @@ class CSymbolTable {
   std::vector<Entry> m_entries;  // slots behind m_used keep their storage for the next insertion
   std::size_t m_used = 0;
   std::size_t m_holes = 0;
+  int m_borrower = -1;  // the entry whose text is borrowed
   std::array<int, kBuckets> m_buckets;
 };
+
+inline std::size_t CSymbolTable::bucketOf(std::string_view text) {
+  if (text.empty()) {
+    return 0;
+  }
+  const auto first = static_cast<unsigned char>(text.front());
+  const auto last = static_cast<unsigned char>(text.back());
+  return (text.size() * 7 + first * 3U + last) % kBuckets;
+}
+
+inline const CSymbolTable::Entry* CSymbolTable::entryAt(int index) const {
+  if (index < 0 || static_cast<std::size_t>(index) >= m_used) {
+    return nullptr;
+  }
+  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  return entry.kind == Kind::kNone ? nullptr : &entry;
+}
+
+inline int CSymbolTable::findText(std::string_view text) const {
+  int index = m_buckets[bucketOf(text)];
+  while (index >= 0) {
+    const Entry& entry = m_entries[static_cast<std::size_t>(index)];
+    if (entry.text() == text) {
+      return index;
+    }
+    index = entry.next;
+  }
+  return -1;
+}
+
+inline int CSymbolTable::getTokenValue(int index) {
+  const Entry* entry = entryAt(index);
+  return entry == nullptr ? -1 : entry->token;
+}
+
+inline bool CSymbolTable::getValue(int index, std::string& out) {
+  const Entry* entry = entryAt(index);
+  if (entry == nullptr || entry->kind != Kind::kString) {
+    return false;
+  }
+  const std::string_view text = entry->text();
+  if (out.capacity() < text.size()) {
+    out = std::string(text);
+  } else {
+    out.assign(text);
+  }
+  return true;
+}
 
 #endif  // LIBSCHEMA_CSYMBOLTABLE_H

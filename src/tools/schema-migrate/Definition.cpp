@@ -6,6 +6,8 @@
 
 #include "Inventory.h"
 
+namespace {
+
 void appendLine(DefinitionKind kind, ORVSchema* object, std::string* text) {
   switch (kind) {
     case DefinitionKind::kAttributeType:
@@ -15,6 +17,17 @@ void appendLine(DefinitionKind kind, ORVSchema* object, std::string* text) {
     case DefinitionKind::kVendorExtension:
       return static_cast<ORVAttribute*>(object)->appendLine(text);
   }
+}
+
+}  // namespace
+
+Digest digestOfLine(DefinitionKind kind, ORVSchema* object, std::string* line) {
+  line->clear();
+  appendLine(kind, object, line);
+  line->pop_back();
+  Digest digest;
+  digest.add(*line);
+  return digest;
 }
 
 bool isEqual(const Definition& definition, const Definition& other) {

@@ -29,8 +29,9 @@ struct Definition {
   std::unique_ptr<ORVSchema> object;  // null once it is not needed any more
 };
 
-// Appends the line that the library writes for `object`, with its line end.
-void appendLine(DefinitionKind kind, ORVSchema* object, std::string* text);
+// The digest of the line that the library writes for `object`, without the line end. `line` is a
+// buffer for it.
+Digest digestOfLine(DefinitionKind kind, ORVSchema* object, std::string* line);
 
 // True when the library takes both for the same definition. Both have their objects and one kind;
 // it is `definition` that is compared with `other`.

@@ -98,6 +98,7 @@ Forecast Forecaster::run() {
       break;
     }
   }
+  m_forecast.longestText = m_tokens.longestText();
   return m_forecast;
 }
 
@@ -404,7 +405,7 @@ int Forecaster::oid() {
 }
 
 Outcome Forecaster::failed(const Position& position, const std::string& problem) {
-  m_forecast = {Reading::kFails, position, problem};
+  m_forecast = {Reading::kFails, position, problem, 0};
   return Outcome::kFailed;
 }
 
@@ -414,7 +415,7 @@ Outcome Forecaster::notClosed(const std::string& what) {
 }
 
 Outcome Forecaster::neverEnds(const Position& position, const std::string& problem) {
-  m_forecast = {Reading::kNeverEnds, position, problem};
+  m_forecast = {Reading::kNeverEnds, position, problem, 0};
   return Outcome::kNeverEnds;
 }
 

@@ -10,6 +10,7 @@
 #ifndef SCHEMA_MIGRATE_ENDLESS_INPUT_H
 #define SCHEMA_MIGRATE_ENDLESS_INPUT_H
 
+#include <cstddef>
 #include <string>
 #include <string_view>
 
@@ -31,6 +32,7 @@ struct Forecast {
   Reading reading = Reading::kSucceeds;
   Position position;    // of what is the matter
   std::string problem;  // what was found, why it cannot be read, how to mend the file; else empty
+  std::size_t longestText = 0;  // of the words, quoted strings and numbers met
 };
 
 // Is told of what the forecast comes by.

@@ -109,6 +109,7 @@ std::string Inventory::readFile(std::size_t file, std::string* warnings) {
     if (forecast.reading != Reading::kSucceeds) {
       return errorLine(placeOf(path, forecast.position), forecast.problem);
     }
+    m_longestText = std::max(m_longestText, forecast.longestText);
   }
   return takeDefinitions(file, listener.lines);
 }
@@ -138,12 +139,13 @@ std::string Inventory::takeDefinitions(std::size_t file, const std::vector<std::
 }
 
 void Inventory::makeDigests() {
+  // Room for a long text and what is short: a line that had to grow would for a while be there
+  // twice.
+  constexpr std::size_t kRest = 4096;
   std::string line;
+  line.reserve(m_longestText + kRest);
   for (Definition& definition : m_definitions) {
-    line.clear();
-    appendLine(definition.kind, definition.object.get(), &line);
-    line.pop_back();
-    definition.lineDigest.add(line);
+    definition.lineDigest = digestOfLine(definition.kind, definition.object.get(), &line);
   }
 }
 

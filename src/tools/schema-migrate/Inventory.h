@@ -5,6 +5,7 @@
 #define SCHEMA_MIGRATE_INVENTORY_H
 
 #include <array>
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -45,6 +46,7 @@ class Inventory {
   std::array<bool, kSchemaFiles.size()> m_hasFile{};
   std::array<std::uint64_t, kSchemaFiles.size()> m_counts{};
   std::vector<Definition> m_definitions;
+  std::size_t m_longestText = 0;
 };
 
 #endif  // SCHEMA_MIGRATE_INVENTORY_H

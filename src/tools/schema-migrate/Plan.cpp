@@ -1,5 +1,8 @@
 #include "Plan.h"
 
+#include <algorithm>
+#include <iterator>
+
 namespace {
 
 constexpr char kNoOid[] =
@@ -15,6 +18,12 @@ bool isOnlyRepeated(const Definition& repeated, const Definition& earlier) {
 
 std::string named(const Definition& definition) {
   return describe(definition) + " at " + placeOf(definition);
+}
+
+// What to do when NEW's definition is to be kept.
+std::string orExclude(const Definition& definition) {
+  return ", or list " + printable(definition.oid) +
+         " in a file for --exclude-oids to keep what NEW has";
 }
 
 }  // namespace
@@ -37,18 +46,17 @@ Plan::Plan(const Inventory& oldOne, const Inventory& newOne, const OidLists& lis
     }
   }
   fillContents();
+  m_rehearsal.releaseTables();
 }
 
 // Marks what is written from NEW's tables as they stand.
 Plan::Marks Plan::markWritten(const Inventory& oldOne, const Inventory& newOne) const {
   Marks marks(oldOne, newOne);
   const Tables& tables = m_rehearsal.newTables();
-  for (std::size_t file = 0; file < kWrittenFiles; ++file) {
-    for (const std::string_view oid : tables.oidsOf(file)) {
-      for (const Definition* const definition : tables.writtenFor(oid)) {
-        if (definition != nullptr) {
-          marks[*definition] = 1;
-        }
+  for (const Tables::FiledOid& filed : tables.filedOids()) {
+    for (const Definition* const definition : tables.writtenFor(filed.oid)) {
+      if (definition != nullptr) {
+        marks[*definition] = 1;
       }
     }
   }
@@ -90,7 +98,7 @@ void Plan::judgeMoved(const Definition& definition) {
   const Definition* culprit = nullptr;
   const std::string reason = whyNotWritten(definition, &culprit);
   if (culprit != nullptr && culprit->inventory != definition.inventory) {
-    refuse(definition, reason);
+    refuse(definition, reason + orExclude(definition));
   } else {
     lose(definition, reason);
   }
@@ -129,7 +137,7 @@ void Plan::judgeNew(const Definition& definition, bool wasWritten) {
   const Definition* culprit = nullptr;
   const std::string reason = whyNotWritten(definition, &culprit);
   if (wasWritten) {
-    return refuse(definition, "the merge would remove it: " + reason);
+    return refuse(definition, "the merge would remove it: " + reason + orExclude(definition));
   }
   if (definition.isInBlock && definition.oid.empty()) {
     return warn(definition, kNoOid);
@@ -174,14 +182,17 @@ std::string Plan::whyNotWritten(const Definition& definition, const Definition**
 
 void Plan::fillContents() {
   const Tables& tables = m_rehearsal.newTables();
-  for (std::size_t file = 0; file < kWrittenFiles; ++file) {
-    const std::vector<std::string_view> oids = tables.oidsOf(file);
-    m_isWrittenEmpty[file] = oids.empty();
-    for (const std::string_view oid : oids) {
-      for (const Definition* const definition : tables.writtenFor(oid)) {
-        if (definition != nullptr) {
-          m_contents[file].push_back(definition);
-        }
+  std::vector<Tables::FiledOid> oids = tables.filedOids();
+  std::sort(oids.begin(), oids.end(),
+            [](const auto& one, const auto& other) { return one.oid < other.oid; });
+  m_isWrittenEmpty.fill(true);
+  for (const Tables::FiledOid& filed : oids) {
+    const auto definitions = tables.writtenFor(filed.oid);
+    for (std::size_t file = 0; file < kWrittenFiles; ++file) {
+      if (filed.isIn(file)) {
+        m_isWrittenEmpty[file] = false;
+        std::copy_if(definitions.begin(), definitions.end(), std::back_inserter(m_contents[file]),
+                     [](const Definition* definition) { return definition != nullptr; });
       }
     }
   }

@@ -26,7 +26,7 @@ std::string whyInNoFile(const Definition& lacking) {
 }  // namespace
 
 Rehearsal::Rehearsal(const Inventory& oldOne, const Inventory& newOne)
-    : m_old(oldOne), m_new(newOne), m_fates(oldOne, newOne) {}
+    : m_oldOne(oldOne), m_old(oldOne), m_new(newOne), m_fates(oldOne, newOne) {}
 
 // The passes in the library's order.
 void Rehearsal::run(const OidLists& lists) {
@@ -64,17 +64,20 @@ void Rehearsal::withdraw(const std::set<std::string>& oids) {
 }
 
 void Rehearsal::compare(DefinitionKind kind, const std::set<std::string>& excluded) {
-  for (const Definition* const definition : m_old.inOrder(kind)) {
-    const std::string_view key = Tables::keyOf(*definition);
-    const Definition* const reference = m_new.walkedAt(kind, key);
-    const bool isExcluded = excluded.count(definition->oid) != 0;
-    if (!isExcluded && (reference == nullptr || !isEqual(*definition, *reference))) {
+  for (const Definition& definition : m_oldOne.definitions()) {
+    const std::string_view key = Tables::keyOf(definition);
+    if (definition.kind != kind || m_old.walkedAt(kind, key) != &definition) {
       continue;
     }
-    m_fates[*definition] = isExcluded ? Fate::kExcluded : Fate::kSame;
+    const Definition* const reference = m_new.walkedAt(kind, key);
+    const bool isExcluded = excluded.count(definition.oid) != 0;
+    if (!isExcluded && (reference == nullptr || !isEqual(definition, *reference))) {
+      continue;
+    }
+    m_fates[definition] = isExcluded ? Fate::kExcluded : Fate::kSame;
     m_old.walked(kind).erase(key);
     if (kind != DefinitionKind::kVendorExtension) {
-      m_old.dropFromFileSets(definition->oid);
+      m_old.dropFromFileSets(definition.oid);
     }
   }
 }
@@ -136,6 +139,11 @@ void Rehearsal::add(const Definition& moved) {
   m_new.walked(moved.kind).try_emplace(Tables::keyOf(moved), &moved);
   m_new.addToFileSet(file, moved.oid);
   m_fates[moved] = Fate::kAdded;
+}
+
+void Rehearsal::releaseTables() {
+  m_old = Tables();
+  m_new = Tables();
 }
 
 void Rehearsal::refuse(const Definition& definition, const std::string& reason) {

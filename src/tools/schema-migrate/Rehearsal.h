@@ -68,6 +68,9 @@ class Rehearsal {
   Fate fateOf(const Definition& definition) { return m_fates[definition]; }
   const std::vector<Refusal>& refusals() const { return m_refusals; }
 
+  // Frees the tables, which are empty from then on.
+  void releaseTables();
+
  private:
   void withdraw(const std::set<std::string>& oids);
   void compare(DefinitionKind kind, const std::set<std::string>& excluded);
@@ -76,6 +79,7 @@ class Rehearsal {
   void add(const Definition& moved);
   void refuse(const Definition& definition, const std::string& reason);
 
+  const Inventory& m_oldOne;
   Tables m_old;
   Tables m_new;
   PerDefinition<Fate> m_fates;

@@ -97,21 +97,16 @@ std::size_t Tables::fileSetOf(const std::string& oid) const {
   return kNoSchemaFile;
 }
 
-bool Tables::isInAnySet(const std::string& oid) const {
-  const auto entry = m_sets.find(oid);
-  return entry != m_sets.end() && entry->second != 0;
-}
-
 void Tables::addToFileSet(std::size_t file, const std::string& oid) { m_sets[oid] |= bitOf(file); }
 
-std::vector<std::string_view> Tables::oidsOf(std::size_t file) const {
-  std::vector<std::string_view> oids;
+std::vector<Tables::FiledOid> Tables::filedOids() const {
+  std::vector<FiledOid> oids;
+  oids.reserve(m_sets.size());
   for (const auto& entry : m_sets) {
-    if ((entry.second & bitOf(file)) != 0) {
-      oids.push_back(entry.first);
+    if (entry.second != 0) {
+      oids.push_back({entry.first, entry.second});
     }
   }
-  std::sort(oids.begin(), oids.end());
   return oids;
 }
 

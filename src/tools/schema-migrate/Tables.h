@@ -23,6 +23,8 @@ class Tables {
  public:
   using Table = std::unordered_map<std::string_view, const Definition*>;
 
+  Tables() = default;
+
   // Every table keeps the first definition under a key. The inventory must stay in place.
   explicit Tables(const Inventory& inventory);
 
@@ -50,13 +52,17 @@ class Tables {
   // The first of the six that holds the OID, or kNoSchemaFile.
   std::size_t fileSetOf(const std::string& oid) const;
 
-  // True when one of the seven file sets holds the OID.
-  bool isInAnySet(const std::string& oid) const;
-
   void addToFileSet(std::size_t file, const std::string& oid);
 
-  // The OIDs in the set of one of the seven files, in order.
-  std::vector<std::string_view> oidsOf(std::size_t file) const;
+  // An OID and the files of the seven whose sets hold it.
+  struct FiledOid {
+    std::string_view oid;
+    unsigned files;
+    bool isIn(std::size_t file) const { return (files >> file & 1U) != 0; }
+  };
+
+  // Every OID that is in a set, in no order.
+  std::vector<FiledOid> filedOids() const;
 
   // The definitions that are written for an OID: none, one, or an attribute type and its extension.
   std::array<const Definition*, 2> writtenFor(std::string_view oid) const;

@@ -2,6 +2,7 @@
 
 #include <libschema/SchemaTokens.h>
 
+#include <algorithm>
 #include <array>
 #include <cstddef>
 
@@ -210,6 +211,7 @@ int TokenReader::readWord(char c) {
 // Quotes make no difference: a keyword in quotes is that keyword. A text that was stored last is
 // the token that it was then, so that 1.2 behind '1.2' is a name.
 int TokenReader::lookUp(int token) {
+  m_longestText = std::max(m_longestText, m_text.size());
   m_textIsStored = false;
   if (m_hasStored && m_text == m_stored) {
     return m_storedToken;

@@ -5,6 +5,7 @@
 #ifndef SCHEMA_MIGRATE_TOKEN_READER_H
 #define SCHEMA_MIGRATE_TOKEN_READER_H
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <string_view>
@@ -38,6 +39,9 @@ class TokenReader {
   // The text of the last word, quoted string or number; for other tokens it means nothing.
   const std::string& text() const { return m_textIsStored ? m_stored : m_text; }
 
+  // The length of the longest of these texts so far.
+  std::size_t longestText() const { return m_longestText; }
+
  private:
   bool refill();
   bool read(char* c);
@@ -66,6 +70,7 @@ class TokenReader {
 
   std::string m_text;
   std::string m_stored;  // the text that the library's symbol table holds besides the keywords
+  std::size_t m_longestText = 0;
   int m_storedToken = 0;
   bool m_hasStored = false;
   bool m_textIsStored = false;

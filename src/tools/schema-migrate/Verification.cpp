@@ -3,6 +3,7 @@
 #include <cstddef>
 #include <memory>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "DefinitionReader.h"
@@ -95,45 +96,67 @@ void checkBytes(const std::string& path, const Contents& expected, bool isEmpty)
   }
 }
 
-std::string doesNotReadBack(const Definition& definition) {
-  return describe(definition) + " of " + placeOf(definition) +
-         " would not be read again as it was: in a schema file quotes stand around names and descriptions only, so that a quoted value elsewhere cannot be written; take the quotes away there, with all but letters, digits, \"-\" and \"_\" between them, or list the OID in a file for --exclude-oids";
+[[noreturn]] void failReadingBack(const Definition& definition) {
+  fail(
+      placeOf(definition),
+      describe(definition) +
+          " would not be read again as it is written: a value in quotes that is neither a name nor a description, an empty value and a second SUP do not survive; mend the definition, or list " +
+          printable(definition.oid) + " in a file for --exclude-oids if it is OLD's");
 }
+
+// Definitions as the library reads them.
+class ReadBack {
+ public:
+  // Returns what the reading comes to, or would come to.
+  Forecast read(const std::string& directory, const std::string& name) {
+    Forecast forecast;
+    {
+      InputFile file(directory + "/" + name);
+      forecast = foreseeReading(&file, nullptr);
+    }
+    const auto take = [this](DefinitionKind kind, bool, std::unique_ptr<ORVSchema> object) {
+      m_objects.emplace_back(kind, std::move(object));
+    };
+    if (forecast.reading == Reading::kSucceeds && !readDefinitions(directory, name, take)) {
+      forecast.reading = Reading::kFails;
+    }
+    return forecast;
+  }
+
+  // The first definition that is not what was expected, or null.
+  const Definition* firstChanged(const Contents& expected) const {
+    std::string line;
+    for (std::size_t i = 0; i < expected.size(); ++i) {
+      const Digest& wanted = expected[i]->lineDigest;
+      line.reserve(wanted.length() + 2);
+      if (i >= m_objects.size() ||
+          digestOfLine(m_objects[i].first, m_objects[i].second.get(), &line) != wanted) {
+        return expected[i];
+      }
+    }
+    return nullptr;
+  }
+
+  std::size_t count() const { return m_objects.size(); }
+
+ private:
+  std::vector<std::pair<DefinitionKind, std::unique_ptr<ORVSchema>>> m_objects;
+};
 
 // Reads the file with the library, as the new release will.
 void checkReading(const std::string& directory, const std::string& name, const Contents& expected) {
-  const std::string path = directory + "/" + name;
-  std::size_t count = 0;
-  std::string line;
-  const auto take = [&](DefinitionKind kind, bool /*isInBlock*/,
-                        std::unique_ptr<ORVSchema> object) {
-    line.clear();
-    appendLine(kind, object.get(), &line);
-    line.pop_back();
-    Digest digest;
-    digest.add(line);
-    if (count >= expected.size()) {
-      fail(path, "holds more definitions than were written");
-    }
-    if (digest != expected[count]->lineDigest) {
-      fail(path, doesNotReadBack(*expected[count]));
-    }
-    ++count;
-  };
-  Forecast forecast;
-  {
-    InputFile file(path);
-    forecast = foreseeReading(&file, nullptr);
+  ReadBack back;
+  const Forecast forecast = back.read(directory, name);
+  const std::uint64_t line = forecast.position.line;
+  if (forecast.reading != Reading::kSucceeds && line >= 2 && line - 2 < expected.size()) {
+    // A definition stands in each line below the header.
+    failReadingBack(*expected[line - 2]);
   }
-  const bool isReadable =
-      forecast.reading == Reading::kSucceeds && readDefinitions(directory, name, take);
-  if (!isReadable || count != expected.size()) {
-    const std::size_t line_number = forecast.position.line;
-    const bool isKnown = forecast.reading != Reading::kSucceeds && line_number >= 2 &&
-                         line_number - 2 < expected.size();
-    const std::size_t place = isKnown ? line_number - 2 : count;
-    fail(path,
-         place < expected.size() ? doesNotReadBack(*expected[place]) : "cannot be read again");
+  if (const Definition* const changed = back.firstChanged(expected)) {
+    failReadingBack(*changed);
+  }
+  if (forecast.reading != Reading::kSucceeds || back.count() != expected.size()) {
+    fail(directory + "/" + name, "would not be read again as it is written");
   }
 }
 

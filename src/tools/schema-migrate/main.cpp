@@ -18,6 +18,7 @@
 #include "OutputDirectory.h"
 #include "Plan.h"
 #include "Report.h"
+#include "SeparateProcess.h"
 #include "Verification.h"
 
 namespace {
@@ -64,9 +65,9 @@ void refuseIfNeeded(const Plan& plan) {
   }
 }
 
-// The inputs are read three times: to work the run out, for the collision reports, which empty the
-// tables that they are made from, and for the run. What one does not need any more it gives back
-// before the next begins.
+// The inputs are read three times: to work the run out, for the collision reports, and for the run.
+// What one does not need any more it gives back before the next begins; the check for collisions
+// cannot, since it empties tables without deleting what was in them.
 void migrate(const Arguments& arguments) {
   std::string warnings;
   OutputDirectory output(arguments.out, arguments.from, arguments.to, &warnings);
@@ -82,7 +83,7 @@ void migrate(const Arguments& arguments) {
   std::cerr << plan.warnings() << std::flush;
 
   const Installations installations{oldOne, newOne, arguments.excludeLists, arguments.withdrawList};
-  print(reportCollisions(installations));
+  print(textFromSeparateProcess([&] { return reportCollisions(installations); }));
   {
     Migration migration(installations);
     migration.write(output.create());

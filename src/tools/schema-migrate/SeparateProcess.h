@@ -1,0 +1,12 @@
+// Work in a process of its own, for what leaves memory behind that nothing can free any more.
+
+#ifndef SCHEMA_MIGRATE_SEPARATE_PROCESS_H
+#define SCHEMA_MIGRATE_SEPARATE_PROCESS_H
+
+#include <functional>
+#include <string>
+
+// Returns the text that `make` returns. A Failure that it throws is thrown here.
+std::string textFromSeparateProcess(const std::function<std::string()>& make);
+
+#endif  // SCHEMA_MIGRATE_SEPARATE_PROCESS_H
