@@ -76,9 +76,6 @@ int SchemaLexan::lexan() {
 // At the end of the input m_lookahead stays what it was. m_tokenvalindex becomes -1 when the end is
 // met between tokens, and stays too when a token that the end cuts short is dropped.
 int SchemaLexan::nextToken() {
-  if (m_input.eof()) {
-    return TOKEN_END;
-  }
   int token = TOKEN_END;
   if (m_input.good()) {
     // Nearly every token lies in the stream's buffer as a whole.
@@ -90,6 +87,9 @@ int SchemaLexan::nextToken() {
       m_line_num = lineNumber;
       return takeToken(scanned == Scanned::kText, buffered.text(), true, token);
     }
+  }
+  if (m_input.eof()) {
+    return TOKEN_END;
   }
   libschema::StreamInput input(&m_input, m_symtable);
   switch (libschema::scanToken(&input, &m_line_num, &token)) {
@@ -112,13 +112,14 @@ int SchemaLexan::nextToken() {
 int SchemaLexan::takeToken(bool hasText, std::string_view text, bool isInBuffer, int token) {
   int index = -1;
   if (hasText) {
-    index = m_symtable->findText(text);
+    const std::size_t bucket = CSymbolTable::bucketOf(text);
+    index = m_symtable->findText(text, bucket);
     if (index < 0 && token == TOKEN_NAME) {
       const std::string_view keyword = foldStart(text);
-      index = keyword.empty() ? -1 : m_symtable->findText(keyword);
+      index = keyword.empty() ? -1 : m_symtable->findText(keyword, CSymbolTable::bucketOf(keyword));
     }
     if (index < 0) {
-      index = isInBuffer ? m_symtable->replaceBorrowed(m_scratch_index, text, token)
+      index = isInBuffer ? m_symtable->replaceBorrowed(m_scratch_index, text, bucket, token)
                          : m_symtable->replaceText(m_scratch_index, text, token);
       m_scratch_index = index;
     } else {

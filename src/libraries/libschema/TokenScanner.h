@@ -58,6 +58,21 @@ struct BufferAccess : std::streambuf {
 
 // The first place from `place` on, or `end`, that is not of the class.
 inline const char* endOfRun(const char* place, const char* end, ByteClass byteClass) {
+  // Four at a time: most of the time of a long file is spent here.
+  for (; end - place >= 4; place += 4) {
+    if (!isOf(place[0], byteClass)) {
+      return place;
+    }
+    if (!isOf(place[1], byteClass)) {
+      return place + 1;
+    }
+    if (!isOf(place[2], byteClass)) {
+      return place + 2;
+    }
+    if (!isOf(place[3], byteClass)) {
+      return place + 3;
+    }
+  }
   while (place != end && isOf(*place, byteClass)) {
     ++place;
   }

@@ -19,26 +19,6 @@ CSymbolTable::Entry* CSymbolTable::appendEntry(Kind kind, int token, bool isKeyw
   return entry;
 }
 
-// Puts the entry last in its bucket, so that a look-up meets the lowest index first.
-void CSymbolTable::link(int index) {
-  Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  entry.bucket = bucketOf(entry.text());
-  int* place = &m_buckets[entry.bucket];
-  while (*place >= 0) {
-    place = &m_entries[static_cast<std::size_t>(*place)].next;
-  }
-  *place = index;
-}
-
-void CSymbolTable::unlink(int index) {
-  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  int* place = &m_buckets[entry.bucket];
-  while (*place != index) {
-    place = &m_entries[static_cast<std::size_t>(*place)].next;
-  }
-  *place = entry.next;
-}
-
 int CSymbolTable::insertValue(std::string value, int token, bool isKeyword) {
   return insertText(value, token, isKeyword);
 }
@@ -53,7 +33,7 @@ int CSymbolTable::insertText(std::string_view text, int token, bool isKeyword) {
   }
   entry->kind = Kind::kString;
   const int index = static_cast<int>(m_used) - 1;
-  link(index);
+  link(index, bucketOf(text));
   return index;
 }
 
@@ -62,25 +42,15 @@ int CSymbolTable::replaceText(int index, std::string_view text, int token) {
   return insertText(text, token, false);
 }
 
-int CSymbolTable::replaceBorrowed(int index, std::string_view text, int token) {
+int CSymbolTable::addBorrowed(int index, std::string_view text, std::size_t bucket, int token) {
   if (text.empty()) {
     return replaceText(index, text, token);
-  }
-  if (index >= 0 && index == m_borrower && index + 1 == static_cast<int>(m_used)) {
-    // The usual case: the last entry borrows one text after the other.
-    Entry& entry = m_entries[static_cast<std::size_t>(index)];
-    unlink(index);
-    entry.borrowed = text;
-    entry.token = token;
-    entry.next = -1;
-    link(index);
-    return index;
   }
   removeValue(index);
   keepBorrowed();
   appendEntry(Kind::kString, token, false)->borrowed = text;
   m_borrower = static_cast<int>(m_used) - 1;
-  link(m_borrower);
+  link(m_borrower, bucket);
   return m_borrower;
 }
 
@@ -98,7 +68,7 @@ int CSymbolTable::insertValue(char value, int token, bool isKeyword) {
   return static_cast<int>(m_used) - 1;
 }
 
-int CSymbolTable::lookUpValue(std::string value) { return findText(value); }
+int CSymbolTable::lookUpValue(std::string value) { return findText(value, bucketOf(value)); }
 
 bool CSymbolTable::getValue(int index, char& out) {
   if (!isCharacter(index)) {

@@ -57,15 +57,17 @@ class CSymbolTable {
   // Writes the table to `out`, each line indented by `indent` TABs.
   void dump(int indent, std::ofstream& out);
 
-  // The same as lookUpValue and insertValue, for a caller whose text lies in a buffer of its own.
-  int findText(std::string_view text) const;
+  // The same as lookUpValue and insertValue, for a caller whose text lies in a buffer of its own. A
+  // bucket, which a text always has the same, spares its second computation.
+  static std::size_t bucketOf(std::string_view text);
+  int findText(std::string_view text, std::size_t bucket) const;
   int insertText(std::string_view text, int token, bool isKeyword);
 
   // Removes the entry `index` and adds a string entry, not as a keyword; returns the new index. A
   // borrowed text is not copied: it must stay where it is until the entry goes or keepBorrowed()
   // has copied it. One text at a time is borrowed.
   int replaceText(int index, std::string_view text, int token);
-  int replaceBorrowed(int index, std::string_view text, int token);
+  int replaceBorrowed(int index, std::string_view text, std::size_t bucket, int token);
   void keepBorrowed();
 
  private:
@@ -87,11 +89,11 @@ class CSymbolTable {
 
   static constexpr std::size_t kBuckets = 128;
 
-  static std::size_t bucketOf(std::string_view text);
   const Entry* entryAt(int index) const;
   Entry* appendEntry(Kind kind, int token, bool isKeyword);
-  void link(int index);
+  void link(int index, std::size_t bucket);
   void unlink(int index);
+  int addBorrowed(int index, std::string_view text, std::size_t bucket, int token);
   std::string describe(std::size_t index) const;
 
   std::vector<Entry> m_entries;  // slots behind m_used keep their storage for the next insertion
@@ -118,8 +120,8 @@ inline const CSymbolTable::Entry* CSymbolTable::entryAt(int index) const {
   return entry.kind == Kind::kNone ? nullptr : &entry;
 }
 
-inline int CSymbolTable::findText(std::string_view text) const {
-  int index = m_buckets[bucketOf(text)];
+inline int CSymbolTable::findText(std::string_view text, std::size_t bucket) const {
+  int index = m_buckets[bucket];
   while (index >= 0) {
     const Entry& entry = m_entries[static_cast<std::size_t>(index)];
     if (entry.text() == text) {
@@ -147,6 +149,40 @@ inline bool CSymbolTable::getValue(int index, std::string& out) {
     out.assign(text);
   }
   return true;
+}
+
+// Puts the entry last in its bucket, so that a look-up meets the lowest index first.
+inline void CSymbolTable::link(int index, std::size_t bucket) {
+  int* place = &m_buckets[bucket];
+  while (*place >= 0) {
+    place = &m_entries[static_cast<std::size_t>(*place)].next;
+  }
+  *place = index;
+  m_entries[static_cast<std::size_t>(index)].bucket = bucket;
+}
+
+inline void CSymbolTable::unlink(int index) {
+  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  int* place = &m_buckets[entry.bucket];
+  while (*place != index) {
+    place = &m_entries[static_cast<std::size_t>(*place)].next;
+  }
+  *place = entry.next;
+}
+
+inline int CSymbolTable::replaceBorrowed(int index, std::string_view text, std::size_t bucket,
+                                         int token) {
+  if (index != m_borrower || index < 0 || index + 1 != static_cast<int>(m_used) || text.empty()) {
+    return addBorrowed(index, text, bucket, token);
+  }
+  // The usual case: the last entry borrows one text after the other.
+  unlink(index);
+  Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  entry.borrowed = text;
+  entry.token = token;
+  entry.next = -1;
+  link(index, bucket);
+  return index;
 }
 
 #endif  // LIBSCHEMA_CSYMBOLTABLE_H
