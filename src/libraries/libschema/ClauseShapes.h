@@ -107,7 +107,7 @@ class Line {
 
   // The values, joined by `separator`.
   Line& addJoined(const std::vector<std::string>& values, std::string_view separator) {
-    std::string_view before;
+    std::string_view before = "";
     for (const std::string& value : values) {
       add(before).add(value);
       before = separator;

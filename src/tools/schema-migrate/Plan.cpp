@@ -177,7 +177,8 @@ std::string Plan::whyNotWritten(const Definition& definition, const Definition**
   if (isExtension && tables.atOid(DefinitionKind::kAttributeType, definition.oid) == nullptr) {
     return "no attribute type has its OID, and a vendor extension is written with its attribute type only; define the attribute type, or remove the extension";
   }
-  return "NEW has what it belongs to in a V3.config.* file only, and those are copied from NEW unchanged; change the copy in the output by hand";
+  return std::string("NEW has ") + (isExtension ? "its attribute type" : "it") +
+         " in a V3.config.* file only, and those are copied from NEW unchanged; if the change is still wanted, make it in the output by hand";
 }
 
 void Plan::fillContents() {

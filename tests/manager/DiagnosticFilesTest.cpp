@@ -1,0 +1,222 @@
+// The diagnostic files have fixed names in a directory that anyone may write to. Whatever stands in
+// their place, reading goes on and nothing outside them is changed.
+
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <string>
+
+#include "Calls.h"
+#include "Files.h"
+#include "Installation.h"
+
+using namespace support;
+
+namespace {
+
+constexpr const char* kOpenedFiles[] = {"/tmp/attr.txt", "/tmp/orvattr.txt", "/tmp/objectclass.txt",
+                                        "/tmp/lexan.txt"};
+constexpr char kTableFile[] = "/tmp/table.txt";
+
+// Clears the place of a diagnostic file for something else, and again when it goes.
+class Place {
+ public:
+  explicit Place(const std::string& path) : m_path(path) { clear(); }
+  ~Place() { clear(); }
+  Place(const Place&) = delete;
+  Place& operator=(const Place&) = delete;
+
+  const char* path() const { return m_path.c_str(); }
+
+ private:
+  void clear() {
+    std::error_code error;
+    std::filesystem::remove(m_path, error);
+    EXPECT_FALSE(std::filesystem::exists(std::filesystem::symlink_status(m_path))) << m_path;
+  }
+
+  std::string m_path;
+};
+
+std::string goodText() { return attributeType("1.1", "a"); }
+
+// A definition of each kind that cannot be parsed would write into the place.
+const char* badTextFor(const std::string& path) {
+  if (path == "/tmp/orvattr.txt") {
+    return "ORVAttributetypes=( 1.1\n";
+  }
+  return path == "/tmp/objectclass.txt" ? "objectclasses=( 1.1\n" : "attributetypes=( 1.1\n";
+}
+
+// Reads a good file and a bad one with something in the place of `path`: the results are the usual
+// ones, and the trace tells that the file could not be opened.
+void expectReadingGoesOn(const std::string& path) {
+  Installation installation;
+  const std::string parsing =
+      "readFile: Parsing file: V3.user.at in directory: " + installation.path() + " \n";
+  const std::string unable = "readFile: unable to open file " + path + "\n";
+  int result = -1;
+  EXPECT_EQ(messagesOf([&] { result = installation.read("V3.user.at", goodText()); }),
+            parsing + unable + "readFile: Successfully parsed the file, V3.user.at.\n");
+  EXPECT_EQ(result, 0);
+  EXPECT_EQ(stateOf(installation.manager()), "attributes: a=1.1(text)\nV3.user.at: 1.1\n");
+  const std::string messages =
+      messagesOf([&] { result = installation.read("V3.user.at", badTextFor(path)); });
+  EXPECT_EQ(messages.substr(0, (parsing + unable).size()), parsing + unable);
+  EXPECT_EQ(result, 1);
+  EXPECT_EQ(installation.read("V3.user.at", badTextFor(path)), 1) << "without tracing";
+}
+
+// The same for the table, of which no message speaks.
+void expectTableIsPassedOver() {
+  Installation installation;
+  EXPECT_EQ(messagesOf([&] { installation.read("V3.user.at", "attributetypes 1.1\n"); }),
+            "readFile: Parsing file: V3.user.at in directory: " + installation.path() +
+                " \n"
+                "readFile: There was an error parsing the file, V3.user.at.\n"
+                "readFile: (3).ATTR: Error occured as } was not found\n");
+  EXPECT_NE(readWholeFile("/tmp/lexan.txt"), "");
+}
+
+}  // namespace
+
+TEST(DiagnosticFiles, SymbolicLinkIsNotFollowed) {
+  const TemporaryDirectory directory;
+  const std::string target = directory.write("target", "precious\n");
+  for (const char* path : kOpenedFiles) {
+    SCOPED_TRACE(path);
+    const Place place(path);
+    ASSERT_EQ(::symlink(target.c_str(), place.path()), 0);
+    expectReadingGoesOn(path);
+    EXPECT_EQ(readWholeFile(target), "precious\n");
+    EXPECT_TRUE(std::filesystem::is_symlink(path));
+  }
+  const Place place(kTableFile);
+  ASSERT_EQ(::symlink(target.c_str(), place.path()), 0);
+  expectTableIsPassedOver();
+  EXPECT_EQ(readWholeFile(target), "precious\n");
+  EXPECT_TRUE(std::filesystem::is_symlink(kTableFile));
+}
+
+TEST(DiagnosticFiles, SymbolicLinkToNothingMakesNoFile) {
+  const TemporaryDirectory directory;
+  const std::string target = directory.file("target");
+  for (const char* path : kOpenedFiles) {
+    SCOPED_TRACE(path);
+    const Place place(path);
+    ASSERT_EQ(::symlink(target.c_str(), place.path()), 0);
+    expectReadingGoesOn(path);
+    EXPECT_FALSE(fileExists(target));
+  }
+  const Place place(kTableFile);
+  ASSERT_EQ(::symlink(target.c_str(), place.path()), 0);
+  expectTableIsPassedOver();
+  EXPECT_FALSE(fileExists(target));
+}
+
+TEST(DiagnosticFiles, SecondNameOfAnotherFileIsNotEmptied) {
+  const TemporaryDirectory directory;
+  const std::string target = directory.write("target", "precious\n");
+  for (const char* path : kOpenedFiles) {
+    SCOPED_TRACE(path);
+    const Place place(path);
+    ASSERT_EQ(::link(target.c_str(), place.path()), 0);
+    expectReadingGoesOn(path);
+    EXPECT_EQ(readWholeFile(target), "precious\n");
+  }
+  const Place place(kTableFile);
+  ASSERT_EQ(::link(target.c_str(), place.path()), 0);
+  expectTableIsPassedOver();
+  EXPECT_EQ(readWholeFile(target), "precious\n");
+}
+
+TEST(DiagnosticFiles, FifoWithoutAReaderDoesNotBlock) {
+  for (const char* path : kOpenedFiles) {
+    SCOPED_TRACE(path);
+    const Place place(path);
+    ASSERT_EQ(::mkfifo(place.path(), 0600), 0);
+    expectReadingGoesOn(path);
+    EXPECT_TRUE(std::filesystem::is_fifo(path));
+  }
+  const Place place(kTableFile);
+  ASSERT_EQ(::mkfifo(place.path(), 0600), 0);
+  expectTableIsPassedOver();
+}
+
+TEST(DiagnosticFiles, FifoWithAReaderIsNotWrittenTo) {
+  const auto expectNothingIn = [](int reader) {
+    char byte = 0;
+    EXPECT_LE(::read(reader, &byte, 1), 0);
+    ::close(reader);
+  };
+  for (const char* path : kOpenedFiles) {
+    SCOPED_TRACE(path);
+    const Place place(path);
+    ASSERT_EQ(::mkfifo(place.path(), 0600), 0);
+    const int reader = ::open(place.path(), O_RDONLY | O_NONBLOCK);
+    ASSERT_GE(reader, 0);
+    expectReadingGoesOn(path);
+    expectNothingIn(reader);
+  }
+  const Place place(kTableFile);
+  ASSERT_EQ(::mkfifo(place.path(), 0600), 0);
+  const int reader = ::open(place.path(), O_RDONLY | O_NONBLOCK);
+  ASSERT_GE(reader, 0);
+  expectTableIsPassedOver();
+  expectNothingIn(reader);
+}
+
+TEST(DiagnosticFiles, DirectoryInPlaceIsLeft) {
+  for (const char* path : kOpenedFiles) {
+    SCOPED_TRACE(path);
+    const Place place(path);
+    ASSERT_EQ(::mkdir(place.path(), 0700), 0);
+    expectReadingGoesOn(path);
+    EXPECT_TRUE(std::filesystem::is_directory(path));
+  }
+  const Place place(kTableFile);
+  ASSERT_EQ(::mkdir(place.path(), 0700), 0);
+  expectTableIsPassedOver();
+}
+
+TEST(DiagnosticFiles, AllFourAreTriedInOrder) {
+  const Place attr("/tmp/attr.txt");
+  const Place orvattr("/tmp/orvattr.txt");
+  const Place objectclass("/tmp/objectclass.txt");
+  const Place lexan("/tmp/lexan.txt");
+  for (const char* path : kOpenedFiles) {
+    ASSERT_EQ(::mkdir(path, 0700), 0) << path;
+  }
+  Installation installation;
+  int result = -1;
+  EXPECT_EQ(messagesOf([&] { result = installation.read("V3.user.at", goodText()); }),
+            "readFile: Parsing file: V3.user.at in directory: " + installation.path() +
+                " \n"
+                "readFile: unable to open file /tmp/attr.txt\n"
+                "readFile: unable to open file /tmp/orvattr.txt\n"
+                "readFile: unable to open file /tmp/objectclass.txt\n"
+                "readFile: unable to open file /tmp/lexan.txt\n"
+                "readFile: Successfully parsed the file, V3.user.at.\n");
+  EXPECT_EQ(result, 0);
+  EXPECT_EQ(stateOf(installation.manager()), "attributes: a=1.1(text)\nV3.user.at: 1.1\n");
+  EXPECT_EQ(installation.read("V3.user.at", "objectclasses=( 1.1\n"), 1);
+}
+
+TEST(DiagnosticFiles, AreMadeWhenMissing) {
+  const Place attr("/tmp/attr.txt");
+  const Place orvattr("/tmp/orvattr.txt");
+  const Place objectclass("/tmp/objectclass.txt");
+  const Place lexan("/tmp/lexan.txt");
+  const Place table(kTableFile);
+  Installation installation;
+  EXPECT_EQ(installation.read("V3.user.at", goodText()), 0);
+  for (const char* path : kOpenedFiles) {
+    EXPECT_EQ(readWholeFile(path), "") << path;
+  }
+  EXPECT_FALSE(fileExists(kTableFile));
+  EXPECT_EQ(installation.read("V3.user.at", "objectclasses=( 1.1\n"), 1);
+  EXPECT_TRUE(fileExists(kTableFile));
+}
