@@ -1,8 +1,9 @@
 #include "Report.h"
 
+#include <algorithm>
 #include <array>
+#include <cstddef>
 #include <cstdint>
-#include <cstdio>
 
 #include "Messages.h"
 #include "SchemaFiles.h"
@@ -43,15 +44,17 @@ Row rowOf(std::size_t file, const Inventory& oldOne, const Inventory& newOne, Pl
   return row;
 }
 
-std::string formatted(const std::string& name, const Row& row) {
-  std::array<char, 256> line{};
-  std::snprintf(
-      line.data(), line.size(), "%-18s%9llu%10llu%9llu%9llu%10llu%10llu\n", name.c_str(),
-      static_cast<unsigned long long>(row.readOld), static_cast<unsigned long long>(row.readNew),
-      static_cast<unsigned long long>(row.kept), static_cast<unsigned long long>(row.added),
-      static_cast<unsigned long long>(row.replaced),
-      static_cast<unsigned long long>(row.kept + row.added + row.replaced));
-  return line.data();
+std::string column(std::uint64_t number, std::size_t width) {
+  const std::string text = std::to_string(number);
+  return std::string(width > text.size() ? width - text.size() : 1, ' ') + text;
+}
+
+std::string formatted(std::string name, const Row& row) {
+  constexpr std::size_t kNameWidth = 18;
+  name.resize(std::max(name.size(), kNameWidth), ' ');
+  return name + column(row.readOld, 9) + column(row.readNew, 10) + column(row.kept, 9) +
+         column(row.added, 9) + column(row.replaced, 10) +
+         column(row.kept + row.added + row.replaced, 10) + "\n";
 }
 
 void addTo(Row* total, const Row& row) {

@@ -77,7 +77,7 @@ std::string textFromSeparateProcess(const std::function<std::string()>& make) {
     serve(ends[1], make);
   }
   ::close(ends[1]);
-  const std::string text = child < 0 ? std::string() : readAll(ends[0]);
+  std::string text = child < 0 ? std::string() : readAll(ends[0]);
   ::close(ends[0]);
   int status = 0;
   if (child < 0 || ::waitpid(child, &status, 0) != child) {

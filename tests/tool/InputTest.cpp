@@ -1,0 +1,211 @@
+// Inputs that are missing, of the wrong kind, unreadable or cannot be parsed: exit code 3, the
+// place, and nothing written.  Odd bytes that are no error: the right result.
+
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/socket.h>
+#include <sys/stat.h>
+#include <sys/un.h>
+#include <unistd.h>
+
+#include <filesystem>
+
+#include "ToolRun.h"
+
+namespace {
+
+struct Row {
+  const char* name;
+  void (*damage)(const ToolFolder& folder);
+  std::vector<std::string> more;
+  const char* err;
+};
+
+void PrintTo(const Row& row, std::ostream* out) { *out << row.name; }
+
+void makeSocket(const std::string& path) {
+  sockaddr_un address{};
+  address.sun_family = AF_UNIX;
+  ASSERT_LT(path.size(), sizeof address.sun_path);
+  path.copy(address.sun_path, path.size());
+  const int descriptor = ::socket(AF_UNIX, SOCK_STREAM, 0);
+  ASSERT_EQ(0, ::bind(descriptor, reinterpret_cast<sockaddr*>(&address), sizeof address));
+  ::close(descriptor);
+}
+
+const Row kRows[] = {
+    {"OldIsMissing",
+     [](const ToolFolder& f) { std::filesystem::remove_all(f.file("old")); },
+     {},
+     "@/old: error: the directory of OLD cannot be read: No such file or directory\n"},
+    {"NewIsMissing",
+     [](const ToolFolder& f) { std::filesystem::remove_all(f.file("new")); },
+     {},
+     "@/new: error: the directory of NEW cannot be read: No such file or directory\n"},
+    {"OldIsAFile",
+     [](const ToolFolder& f) {
+       std::filesystem::remove_all(f.file("old"));
+       f.write("old", "");
+     },
+     {},
+     "@/old: error: the directory of OLD cannot be read: Not a directory\n"},
+    {"NoSchemaFile",
+     [](const ToolFolder& f) { std::filesystem::remove(f.file("new/V3.user.at")); },
+     {},
+     "@/new: error: no V3.* schema file in the directory of NEW; name the directory that holds V3.system.at and its like\n"},
+    {"DirectoryForAFile",
+     [](const ToolFolder& f) { std::filesystem::create_directory(f.file("old/V3.user.oc")); },
+     {},
+     "@/old/V3.user.oc: error: cannot be read: it is a directory\n"},
+    {"FifoForAFile",
+     [](const ToolFolder& f) { ::mkfifo(f.file("old/V3.orv.at").c_str(), 0666); },
+     {},
+     "@/old/V3.orv.at: error: cannot be read: it is a FIFO\n"},
+    {"DeviceForAFile",
+     [](const ToolFolder& f) {
+       std::filesystem::create_symlink("/dev/zero", f.file("new/V3.config.at"));
+     },
+     {},
+     "@/new/V3.config.at: error: cannot be read: it is a device\n"},
+    {"SocketForAFile",
+     [](const ToolFolder& f) { makeSocket(f.file("new/V3.orv.oc")); },
+     {},
+     "@/new/V3.orv.oc: error: cannot be read: it is a socket\n"},
+    {"LinkToNothing",
+     [](const ToolFolder& f) {
+       std::filesystem::create_symlink("nothing", f.file("new/V3.user.oc"));
+     },
+     {},
+     "@/new/V3.user.oc: error: cannot be read: No such file or directory\n"},
+    {"EachBadFileIsNamed",
+     [](const ToolFolder& f) {
+       f.write("old/V3.user.oc", "objectclasses=( 1.1\n");
+       f.write("old/V3.system.at", "\nattributetypes ( 1.1 )\n");
+       f.write("old/V3.user.at", "\n\nattributetypes=( 1.1 NAME 'a' COLLECTIVE )\n");
+     },
+     {},
+     "@/old/V3.system.at:2:16: error: neither \"=\" nor \"{\" stands behind the word that begins an attribute type; write \"=\" before a single definition, \"{\" before a block of them, or take the word away\n"
+     "@/old/V3.user.at:3:31: error: COLLECTIVE stands in the attribute type that begins in line 3; the reader does not get past this word, so reading would never end; remove the word\n"
+     "@/old/V3.user.oc:2:1: error: the object class that begins in line 1 is not closed: the end of the file comes before its \")\"; write \")\" at its end\n"},
+    {"NamesThatNothingEnds",
+     [](const ToolFolder& f) { f.write("new/V3.user.oc", "objectclasses=( 1.1 NAME 'a' )\n"); },
+     {},
+     "@/new/V3.user.oc:1:21: error: nothing ends the NAME clause of the object class that begins in line 1: only DESC, OBSOLETE, SUP, the kind of the class, MUST or MAY does, \")\" does not, and none follows to the end of the file, so reading would never end; put the kind behind the names, as in NAME 'a' STRUCTURAL )\n"},
+    {"DatabaseNamesThatNothingEnds",
+     [](const ToolFolder& f) {
+       f.write("old/V3.orv.at", "ORVAttributetypes=( 1.1 DBNAME ( 'a'\n");
+     },
+     {},
+     "@/old/V3.orv.at:1:25: error: nothing ends the DBNAME list of the vendor extension that begins in line 1: neither \")\" nor another clause follows to the end of the file, so reading would never end; put \")\" behind the names\n"},
+    {"ListIsMissing",
+     [](const ToolFolder&) {},
+     {"--exclude-oids", "@/list"},
+     "@/list: error: the list of OIDs cannot be read: No such file or directory\n"},
+    {"ListIsAFifo",
+     [](const ToolFolder& f) { ::mkfifo(f.file("list").c_str(), 0666); },
+     {"--withdraw", "@/list"},
+     "@/list: error: the list of OIDs cannot be read: it is a FIFO\n"},
+    {"ListIsADirectory",
+     [](const ToolFolder&) {},
+     {"--withdraw", "@/old"},
+     "@/old: error: the list of OIDs cannot be read: it is a directory\n"},
+    {"ListWithoutALastLineBreak",
+     [](const ToolFolder& f) { f.write("list", "1.1\n1.2"); },
+     {"--exclude-oids", "@/list"},
+     "@/list:2: error: no line break behind the last OID, 1.2, which would therefore not count; add a line break at the end of the file\n"},
+};
+
+class Input : public testing::TestWithParam<Row> {};
+
+TEST_P(Input, IsRefusedWithItsPlace) {
+  const ToolFolder folder;
+  folder.install("old", {{"V3.user.at", "attributetypes=( 1.1 NAME 'a' OBSOLETE )\n"}});
+  folder.install("new", {{"V3.user.at", ""}});
+  GetParam().damage(folder);
+  const std::string names = folder.names();
+  const ToolResult result = folder.migrate(GetParam().more, [] { ::alarm(20); });
+  EXPECT_EQ(3, result.exitCode);
+  EXPECT_EQ("", result.out);
+  EXPECT_EQ(GetParam().err, result.err);
+  EXPECT_EQ(names, folder.names());
+}
+
+INSTANTIATE_TEST_SUITE_P(Rows, Input, testing::ValuesIn(kRows),
+                         [](const auto& row) { return std::string(row.param.name); });
+
+TEST(InputWithoutPermission, IsRefused) {
+  const ToolFolder folder;
+  folder.install("old", {{"V3.user.at", ""}});
+  folder.install("new", {{"V3.user.at", ""}});
+  std::filesystem::permissions(folder.path(), std::filesystem::perms::all);
+  ASSERT_EQ(0, ::chmod(folder.file("old/V3.user.at").c_str(), 0));
+  // Root may read everything, so the run is made as somebody else.
+  const ToolResult result = folder.migrate({}, [] {
+    if (::geteuid() == 0 && (::setgid(65534) != 0 || ::setuid(65534) != 0)) {
+      ::_exit(125);
+    }
+  });
+  EXPECT_EQ(3, result.exitCode);
+  EXPECT_EQ("@/old/V3.user.at: error: cannot be read: Permission denied\n", result.err);
+}
+
+// A comment needs no line break behind it, and blanks of every kind separate OIDs.
+TEST(InputList, TakesWhatTheLibraryTakes) {
+  const ToolFolder folder;
+  folder.install(
+      "old",
+      {{"V3.user.at",
+        "attributetypes { ( 1.1 NAME 'a' OBSOLETE ) ( 1.2 NAME 'b' OBSOLETE ) ( 1.3 NAME 'c' OBSOLETE ) ( 1.4 NAME 'd' OBSOLETE ) }\n"}});
+  folder.install("new", {{"V3.user.at", ""}});
+  folder.write("list", "1.1\t1.2\r\n1.3#x 1.4\n# 1.4");
+  EXPECT_EQ(0, folder.migrate({"--exclude-oids", "@/list"}).exitCode);
+  EXPECT_EQ(
+      kHeader +
+          std::string(
+              "attributetypes=( 1.3 NAME ( 'c'  ) OBSOLETE USAGE userApplications  )\nattributetypes=( 1.4 NAME ( 'd'  ) OBSOLETE USAGE userApplications  )\n"),
+      folder.contents("out")["V3.user.at"]);
+}
+
+TEST(InputBytes, OddOnesBetweenDefinitionsAreNoError) {
+  using std::string_literals::operator""s;
+  const std::string definition = "attributetypes=( 1.1 NAME 'a' OBSOLETE )";
+  const std::string written =
+      kHeader + "attributetypes=( 1.1 NAME ( 'a'  ) OBSOLETE USAGE userApplications  )\n"s;
+  for (const std::string& text :
+       {"\xEF\xBB\xBF" + definition + "\n", "\r\n" + definition + "\r\n", "\0\0"s + definition,
+        "\xFF\xFE" + definition + "\x80", "# \xC3\xA4\n" + definition}) {
+    const ToolFolder folder;
+    folder.install("old", {{"V3.user.at", text}});
+    folder.install("new", {{"V3.user.at", ""}});
+    const ToolResult result = folder.migrate();
+    EXPECT_EQ(0, result.exitCode);
+    EXPECT_EQ("", result.err);
+    EXPECT_EQ(written, folder.contents("out")["V3.user.at"]) << text;
+  }
+}
+
+// A full definition of every kind, cut off behind every byte: the run is made, or refused with a
+// place in this file; it never hangs and never leaves anything behind.
+TEST(InputCutShort, EndsInAResultOrAMessage) {
+  const std::string text =
+      "attributetypes=( 1.1 NAME ( 'a' 'b' ) DESC 'd' SUP c SYNTAX 1.2{3} )\n"
+      "objectclasses { ( 1.4 NAME 'h' SUP i ABSTRACT MUST ( k $ l ) ) }\n"
+      "ORVAttributetypes=( 1.1 DBNAME ( 'a' 'a' ) LENGTH 3 EQUALITY )\n";
+  const ToolFolder folder;
+  folder.install("new", {{"V3.user.at", ""}});
+  for (std::size_t length = 0; length <= text.size(); ++length) {
+    SCOPED_TRACE("first " + std::to_string(length) + " bytes");
+    folder.install("old", {{"V3.user.at", text.substr(0, length)}});
+    const ToolResult result = folder.migrate({}, [] { ::alarm(20); });
+    if (result.exitCode == 0) {
+      EXPECT_EQ(7U, folder.contents("out").size());
+      std::filesystem::remove_all(folder.file("out"));
+    } else {
+      EXPECT_EQ(3, result.exitCode);
+      EXPECT_EQ(0U, result.err.find("@/old/V3.user.at:")) << result.err;
+    }
+    ASSERT_EQ("new old", folder.names());
+  }
+}
+
+}  // namespace

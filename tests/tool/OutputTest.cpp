@@ -1,0 +1,237 @@
+// The output directory: where it may be, that it appears whole or not at all, and what is found out
+// about the files in it.
+
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <filesystem>
+
+#include "ToolRun.h"
+
+namespace {
+
+const ToolFolder::Files kOld = {{"V3.user.at", "attributetypes=( 1.1 NAME 'a' OBSOLETE )\n"}};
+const ToolFolder::Files kNew = {{"V3.user.at", "attributetypes=( 1.2 NAME 'b' OBSOLETE )\n"},
+                                {"V3.config.at", "# config\n"}};
+
+class Output : public testing::Test {
+ protected:
+  Output() {
+    folder.install("old", kOld);
+    folder.install("new", kNew);
+  }
+
+  // A run that must fail, with everything in its place afterwards.
+  void expectFailure(const std::string& err, const std::vector<std::string>& arguments,
+                     const std::function<void()>& prepare = nullptr) {
+    const std::string names = folder.names();
+    const ToolResult result = folder.run(arguments, prepare);
+    EXPECT_EQ(5, result.exitCode);
+    EXPECT_EQ(err, result.err);
+    EXPECT_EQ(names, folder.names());
+    EXPECT_EQ(kOld, folder.contents("old"));
+    EXPECT_EQ(kNew, folder.contents("new"));
+  }
+
+  std::vector<std::string> to(const std::string& out) const {
+    return {"migrate", "--from", "@/old", "--to", "@/new", "--out", out};
+  }
+
+  mode_t modeOf(const std::string& name) const {
+    struct stat status {};
+    EXPECT_EQ(0, ::stat(folder.file(name).c_str(), &status));
+    return status.st_mode & 07777;
+  }
+
+  ToolFolder folder;
+};
+
+TEST_F(Output, IsCreatedWithTheModeOfAnyNewDirectory) {
+  EXPECT_EQ(0, folder.migrate({}, [] { ::umask(027); }).exitCode);
+  EXPECT_EQ(8U, folder.contents("out").size());
+  EXPECT_EQ(0750U, modeOf("out"));
+  EXPECT_EQ(0640U, modeOf("out/V3.user.at"));
+  EXPECT_EQ(0640U, modeOf("out/V3.config.at"));
+}
+
+TEST_F(Output, ReplacesAnEmptyDirectoryAndKeepsItsModeAndOwner) {
+  ASSERT_TRUE(std::filesystem::create_directory(folder.file("out")));
+  ASSERT_EQ(0, ::chmod(folder.file("out").c_str(), 0710));
+  if (::geteuid() == 0) {
+    ASSERT_EQ(0, ::chown(folder.file("out").c_str(), 12, 34));
+  }
+  EXPECT_EQ(0, folder.migrate().exitCode);
+  EXPECT_EQ(8U, folder.contents("out").size());
+  EXPECT_EQ(0710U, modeOf("out"));
+  struct stat status {};
+  ASSERT_EQ(0, ::stat(folder.file("out").c_str(), &status));
+  if (::geteuid() == 0) {
+    EXPECT_EQ(12U, status.st_uid);
+    EXPECT_EQ(34U, status.st_gid);
+  }
+}
+
+TEST_F(Output, MayBeNamedWithASlashOrFromTheWorkingDirectory) {
+  EXPECT_EQ(0, folder.run(to("@/one//")).exitCode);
+  EXPECT_EQ(
+      0,
+      folder.run(to("two"), [&] { static_cast<void>(!::chdir(folder.path().c_str())); }).exitCode);
+  EXPECT_EQ("new old one two", folder.names());
+}
+
+TEST_F(Output, ThatIsNotEmptyIsLeftAlone) {
+  folder.install("out", {{"mine", "x"}});
+  expectFailure("@/out: error: the output directory is not empty; name a new or an empty one\n",
+                to("@/out"));
+  EXPECT_EQ((ToolFolder::Files{{"mine", "x"}}), folder.contents("out"));
+}
+
+TEST_F(Output, ThatIsAFileIsLeftAlone) {
+  folder.write("out", "mine");
+  expectFailure(
+      "@/out: error: exists and is not a directory; the output directory must be new or empty\n",
+      to("@/out"));
+  EXPECT_EQ("mine", support::readWholeFile(folder.file("out")));
+}
+
+TEST_F(Output, ThatIsALinkIsLeftAlone) {
+  std::filesystem::create_directory(folder.file("empty"));
+  std::filesystem::create_symlink("empty", folder.file("out"));
+  expectFailure(
+      "@/out: error: exists and is not a directory; the output directory must be new or empty\n",
+      to("@/out"));
+}
+
+TEST_F(Output, WithoutAPlaceToCreateItIn) {
+  folder.write("file", "");
+  expectFailure(
+      "@/a/out: error: the directory to create it in, @/a, cannot be used: No such file or directory\n",
+      to("@/a/out"));
+  expectFailure(
+      "@/file/out: error: the output directory cannot be created in @/file, which is not a directory\n",
+      to("@/file/out"));
+}
+
+TEST_F(Output, WithoutPermission) {
+  std::filesystem::create_directory(folder.file("shut"));
+  std::filesystem::permissions(folder.path(), std::filesystem::perms::all);
+  ASSERT_EQ(0, ::chmod(folder.file("shut").c_str(), 0555));
+  expectFailure(
+      "@/shut/out: error: the output directory cannot be created in @/shut: Permission denied\n",
+      to("@/shut/out"), [] {
+        if (::geteuid() == 0 && (::setgid(65534) != 0 || ::setuid(65534) != 0)) {
+          ::_exit(125);
+        }
+      });
+}
+
+// The library does not notice that a write fails; reading back does.
+TEST_F(Output, ThatDoesNotFitIsRemoved) {
+  std::string many;
+  for (int i = 0; i < 2000; ++i) {
+    many += "attributetypes=( 1.3." + std::to_string(i) + " NAME 'n" + std::to_string(i) +
+            "' OBSOLETE )\n";
+  }
+  folder.install("large", {{"V3.user.at", many}});
+  const ToolResult result =
+      folder.run({"migrate", "--from", "@/large", "--to", "@/new", "--out", "@/out"}, [] {
+        const rlimit limit{4096, 4096};
+        ::setrlimit(RLIMIT_FSIZE, &limit);
+      });
+  EXPECT_EQ(5, result.exitCode);
+  EXPECT_NE(std::string::npos,
+            result.err.find("V3.user.at: error: was not written completely: it ends in line "))
+      << result.err;
+  EXPECT_NE(std::string::npos, result.err.find("is there space left on the file system?\n"))
+      << result.err;
+  EXPECT_EQ("large new old", folder.names());
+}
+
+TEST_F(Output, CopyThatDoesNotFitIsRemoved) {
+  folder.write("new/V3.config.oc", std::string(100000, '\n'));
+  const ToolResult result = folder.migrate({}, [] {
+    const rlimit limit{50000, 50000};
+    ::setrlimit(RLIMIT_FSIZE, &limit);
+  });
+  EXPECT_EQ(5, result.exitCode);
+  EXPECT_NE(std::string::npos,
+            result.err.find("/V3.config.oc: error: cannot be written: File too large\n"))
+      << result.err;
+  EXPECT_EQ("new old", folder.names());
+}
+
+TEST_F(Output, LeftoverOfAKilledRunIsNamedAndLeft) {
+  folder.install(".out.partial-abcdef", {{"V3.user.at", "half"}});
+  const ToolResult result = folder.migrate();
+  EXPECT_EQ(0, result.exitCode);
+  EXPECT_EQ(
+      "@/.out.partial-abcdef: warning: left behind by a run that was killed; it is not used, and can be removed\n",
+      result.err);
+  EXPECT_EQ((ToolFolder::Files{{"V3.user.at", "half"}}), folder.contents(".out.partial-abcdef"));
+  EXPECT_EQ(8U, folder.contents("out").size());
+}
+
+TEST_F(Output, ReportThatCannotBePrintedStopsTheRun) {
+  const ToolResult result = folder.migrate({}, [] {
+    if (::freopen("/dev/full", "w", stdout) == nullptr) {
+      ::_exit(125);
+    }
+  });
+  EXPECT_EQ(5, result.exitCode);
+  EXPECT_EQ("schema-migrate: error: the report cannot be written to standard output\n", result.err);
+  EXPECT_EQ("new old", folder.names());
+}
+
+// With standard output closed, a file of the output would be opened in its place.
+TEST_F(Output, IsNotMixedUpWithAClosedStandardOutput) {
+  folder.migrate({}, [] {
+    ::close(STDIN_FILENO);
+    ::close(STDOUT_FILENO);
+    ::close(STDERR_FILENO);
+  });
+  EXPECT_EQ(
+      kHeader +
+          std::string(
+              "attributetypes=( 1.1 NAME ( 'a'  ) OBSOLETE USAGE userApplications  )\nattributetypes=( 1.2 NAME ( 'b'  ) OBSOLETE USAGE userApplications  )\n"),
+      folder.contents("out")["V3.user.at"]);
+}
+
+// ---- Definitions that writing would change ----
+
+struct Row {
+  const char* name;
+  const char* definition;
+};
+
+void PrintTo(const Row& row, std::ostream* out) { *out << row.name; }
+
+const Row kRows[] = {
+    {"SuperiorWithABlank", "SUP 'a b'"},
+    {"SecondSuperior", "SUP a SUP b"},
+    {"UsageThatIsEmpty", "USAGE ''"},
+    {"UsageThatIsANumber", "USAGE '12'"},
+    {"ValueThatNeverEnds", "EQUALITY 'a COLLECTIVE b'"},
+    {"ValueThatBeginsAnother", "SYNTAX 'a attributetypes b'"},
+};
+
+class Unwritable : public testing::TestWithParam<Row> {};
+
+TEST_P(Unwritable, DefinitionIsFoundOutAndNothingIsLeft) {
+  const ToolFolder folder;
+  folder.install("old", {{"V3.user.at", std::string("# first\nattributetypes=( 1.1 NAME 'a' ") +
+                                            GetParam().definition + " )\n"}});
+  folder.install("new", kNew);
+  const ToolResult result = folder.migrate({}, [] { ::alarm(20); });
+  EXPECT_EQ(5, result.exitCode);
+  EXPECT_EQ(
+      "@/old/V3.user.at:2: error: attribute type a (1.1) would not be read again as it is written: a value in quotes that is neither a name nor a description, an empty value and a second SUP do not survive; mend the definition, or list 1.1 in a file for --exclude-oids if it is OLD's\n",
+      result.err);
+  EXPECT_EQ("new old", folder.names());
+}
+
+INSTANTIATE_TEST_SUITE_P(Rows, Unwritable, testing::ValuesIn(kRows),
+                         [](const auto& row) { return std::string(row.param.name); });
+
+}  // namespace
