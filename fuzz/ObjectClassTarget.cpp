@@ -1,0 +1,7 @@
+#include "ParserTarget.h"
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  fuzz::parseBlock<ObjectClass, definitions::ReferenceObjectClass>("objectclasses",
+                                                                   fuzz::textOf(data, size));
+  return 0;
+}
