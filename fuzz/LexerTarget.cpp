@@ -1,8 +1,12 @@
 // The lexical analyser over any bytes, step by step against a second one that is as simple as can
 // be.
 
+#include <algorithm>
+#include <cstddef>
 #include <fstream>
+#include <functional>
 #include <string>
+#include <vector>
 
 #include "ReferenceLexer.h"
 #include "SchemaLexan.h"
@@ -87,6 +91,30 @@ void readMatching(const std::string& text) {
   }
 }
 
+std::vector<std::string> tokensIn(const std::string& text) {
+  fuzz::write(kFile, text);
+  SchemaLexan lexer(fuzz::folder(), kFile);
+  std::vector<std::string> tokens;
+  int token = 0;
+  do {
+    token = lexer.lexan();
+    tokens.push_back(std::to_string(token) + " " +
+                     state(textOf(&lexer), lexer.getTokenValIndex(), lexer.getCurrentToken(),
+                           lexer.getLineNumber()));
+  } while (token != TOKEN_END);
+  return tokens;
+}
+
+// Blanks in front change nothing, though they have the end of the first buffer of the input stream
+// fall on any place in the text.
+void readBehindBlanks(const std::string& text) {
+  constexpr std::size_t kBuffer = 8191;  // bytes that the stream reads at a time
+  const std::vector<std::string> expected = tokensIn(text);
+  const std::size_t place = std::hash<std::string>()(text) % (text.size() + 1);
+  const std::string blanks(kBuffer - std::min(place, kBuffer), ' ');
+  fuzz::require(tokensIn(blanks + text) == expected, "behind blanks");
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
@@ -94,5 +122,6 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   fuzz::write(kFile, text);
   readAll();
   readMatching(text);
+  readBehindBlanks(text);
   return 0;
 }

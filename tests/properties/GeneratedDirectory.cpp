@@ -1,5 +1,7 @@
 #include "GeneratedDirectory.h"
 
+#include <cstddef>
+
 #include "ManagerTables.h"
 
 namespace properties {
@@ -23,7 +25,7 @@ constexpr const char* kExtensionClauses[] = {"ACCESS-CLASS normal LENGTH 9 EQUAL
                                              "ACCESS-CLASS Normal LENGTH 9 EQUALITY",
                                              "ACCESS-CLASS critical", "LENGTH 09 APPROX", ""};
 
-std::string clausesFor(GeneratedDefinition::Kind kind, Choices* choices) {
+const char* clausesFor(GeneratedDefinition::Kind kind, Choices* choices) {
   switch (kind) {
     case GeneratedDefinition::kAttribute:
       return choices->oneOf(kAttributeClauses);
@@ -45,6 +47,17 @@ GeneratedDefinition anyDefinition(Choices* choices) {
   }
   definition.clauses = clausesFor(definition.kind, choices);
   return definition;
+}
+
+// Definitions of one kind that have nothing to do with the others, for tables that are not small.
+void addMany(Choices* choices, GeneratedDirectory* directory) {
+  const auto kind = static_cast<GeneratedDefinition::Kind>(choices->below(3));
+  const char* const file = choices->oneOf(kFiles);
+  const char* const clauses = clausesFor(kind, choices);
+  for (unsigned number = 10; number < 40; ++number) {
+    const std::string digits = std::to_string(number);
+    directory->push_back({kind, file, "1." + digits + ".0", {"many" + digits}, clauses});
+  }
 }
 
 std::string quotedNames(const std::vector<std::string>& names) {
@@ -76,12 +89,20 @@ GeneratedDirectory anyDirectory(Choices* choices) {
   for (unsigned count = choices->below(13); count > 0; --count) {
     directory.push_back(anyDefinition(choices));
   }
+  if (choices->below(8) == 7) {
+    addMany(choices, &directory);
+  }
   return directory;
 }
 
 GeneratedDirectory relativeOf(const GeneratedDirectory& directory, Choices* choices) {
   GeneratedDirectory relative;
+  const bool isThin = choices->below(4) == 3;
+  std::size_t number = 0;
   for (GeneratedDefinition definition : directory) {
+    if (isThin && ++number % 12 != 0) {
+      continue;
+    }
     switch (choices->below(10)) {
       case 0:
         continue;

@@ -27,7 +27,7 @@ using GeneratedDirectory = std::vector<GeneratedDefinition>;
 // spelled like an OID.
 GeneratedDirectory anyDirectory(Choices* choices);
 
-// The same with definitions taken out, changed and added.
+// The same with definitions taken out, changed and added; sometimes with hardly any left.
 GeneratedDirectory relativeOf(const GeneratedDirectory& directory, Choices* choices);
 
 // Definitions that fit together, with those of every other such directory too: a name and an OID

@@ -48,6 +48,7 @@ class Run {
   void merge(std::size_t self, std::size_t other);
   void check(std::size_t self, std::size_t other);
   void list(std::size_t self);
+  void findOids(std::size_t self, std::size_t other);
   void dropOids(std::size_t self);
   void expect(bool expected, bool actual);
 
@@ -100,8 +101,9 @@ std::string Run::step() {
       list(self);
       return done("list", self, self);
     default:
+      findOids(self, other);
       dropOids(self);
-      return done("drop OIDs", self, self);
+      return done("find and drop OIDs", self, other);
   }
 }
 
@@ -183,6 +185,9 @@ void Run::check(std::size_t self, std::size_t other) {
       result = manager(self)->checkCollisions(manager(other));
   }
   m_counts.dropped += static_cast<unsigned>(before - sizeOf(m_states[self]));
+  const std::string reports = manager(self)->getOcTable() + manager(self)->getORVAttrTable() +
+                              manager(self)->getAttrTable();
+  expect(true, reports == reportsOf(m_states[self]));
   expect(true, result);
 }
 
@@ -199,6 +204,15 @@ void Run::list(std::size_t self) {
   withdraw(&m_states[self], oidsIn(list));
   m_counts.withdrawn += static_cast<unsigned>(before - sizeOf(m_states[self]));
   expect(true, manager(self)->modifySchema(path) == 0);
+}
+
+void Run::findOids(std::size_t self, std::size_t other) {
+  for (const std::string& oid : oidsIn(anyOidList(&m_choices))) {
+    const std::size_t file = fileOf(m_states[other], oid);
+    const OidSet* const found = manager(self)->findOidInSet(manager(other), oid);
+    expect(file == kFileNames.size(), found == nullptr);
+    expect(true, found == nullptr || *found == m_states[self].fileSets[file]);
+  }
 }
 
 void Run::dropOids(std::size_t self) {

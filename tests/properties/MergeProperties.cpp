@@ -8,10 +8,12 @@
 #include <string>
 
 #include "Pairs.h"
+#include "Rules.h"
 
 namespace {
 
 using properties::differenceOf;
+using properties::fileOf;
 using properties::forAnyPairs;
 using properties::forConsistentPairs;
 using properties::forEachTable;
@@ -20,15 +22,6 @@ using properties::Pair;
 using properties::sizeOf;
 using properties::State;
 using properties::stateOf;
-
-// Index of the first set that holds the OID; the number of sets when none does.
-std::size_t fileOf(const State& state, const std::string& oid) {
-  std::size_t file = 0;
-  while (file < state.fileSets.size() && state.fileSets[file].count(oid) == 0) {
-    ++file;
-  }
-  return file;
-}
 
 // Between definitions that fit together: where a name stands under several OIDs, an OID under
 // several names, or a name is spelled like an OID, other definitions are replaced than the one with

@@ -38,15 +38,6 @@ void eraseAll(const OidSet& keys, Table<Definition>* table) {
   }
 }
 
-// Index of the first set that holds the OID; the number of sets when none does.
-std::size_t fileOf(const State& state, const std::string& oid) {
-  std::size_t file = 0;
-  while (file < state.fileSets.size() && state.fileSets[file].count(oid) == 0) {
-    ++file;
-  }
-  return file;
-}
-
 bool join(State* self, const State& source, const std::string& oid) {
   const std::size_t file = fileOf(source, oid);
   if (file == source.fileSets.size()) {
@@ -58,7 +49,27 @@ bool join(State* self, const State& source, const std::string& oid) {
 
 bool isSpace(char c) { return c == ' ' || (c >= '\t' && c <= '\r'); }
 
+std::string joined(const std::vector<std::string>& names) {
+  std::string text;
+  for (const std::string& name : names) {
+    text += (text.empty() ? "" : ", ") + name;
+  }
+  return text;
+}
+
+std::string entryOf(const std::string& oid, const std::vector<std::string>& names) {
+  return "OID --> " + oid + "\nName --> " + joined(names) + "\n\n";
+}
+
 }  // namespace
+
+std::size_t fileOf(const State& state, const std::string& oid) {
+  std::size_t file = 0;
+  while (file < state.fileSets.size() && state.fileSets[file].count(oid) == 0) {
+    ++file;
+  }
+  return file;
+}
 
 int dropFromFileSets(State* self, const std::string& oid) {
   const std::size_t file = fileOf(*self, oid);
@@ -250,6 +261,27 @@ void checkAll(State* self, State* reference) {
   checkClasses(self, *reference);
   checkAttributes(self, reference);
   checkExtensions(self, *reference);
+}
+
+std::string reportsOf(const State& state) {
+  std::string text = state.ocTable.empty()
+                         ? "No objectClasses definition collisions found.\n"
+                         : "The following objectClasses definition collisions found:\n";
+  for (const auto& entry : state.ocTable) {
+    text += entryOf(entry.second->getOid(), entry.second->getNames());
+  }
+  text += state.orvAttrTable.empty()
+              ? "No ORVAttributeTypes definition collisions found.\n"
+              : "The following ORVAttributeTypes definition collisions found:\n";
+  for (const auto& entry : state.orvAttrTable) {
+    text += entryOf(entry.second->getOid(), databaseNamesOf(*entry.second));
+  }
+  text += state.attrTable.empty() ? "No attributeTypes definition collisions found.\n"
+                                  : "The following attributeTypes collisions found:\n";
+  for (const auto& entry : state.attrTable) {
+    text += entryOf(entry.second->getOid(), entry.second->getNames());
+  }
+  return text;
 }
 
 // ---- Lists of OIDs ----

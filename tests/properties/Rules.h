@@ -5,6 +5,7 @@
 #ifndef LIBSCHEMA_TESTS_RULES_H
 #define LIBSCHEMA_TESTS_RULES_H
 
+#include <cstddef>
 #include <string>
 
 #include "ManagerTables.h"
@@ -28,6 +29,13 @@ void checkExtensions(State* self, const State& reference);
 void compareAll(State* self, const State& reference);
 bool mergeAll(State* self, State* source);
 void checkAll(State* self, State* reference);
+
+// The three reports of a check, one after the other: object classes, vendor extensions, attribute
+// types.
+std::string reportsOf(const State& state);
+
+// Index of the first set that holds the OID; the number of sets when none does.
+std::size_t fileOf(const State& state, const std::string& oid);
 
 // Withdraws the definitions with these OIDs.
 void withdraw(State* self, const OidSet& oids);

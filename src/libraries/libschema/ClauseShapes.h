@@ -107,10 +107,10 @@ class Line {
 
   // The values, joined by `separator`.
   Line& addJoined(const std::vector<std::string>& values, std::string_view separator) {
-    std::string_view before = "";
+    bool isFirst = true;
     for (const std::string& value : values) {
-      add(before).add(value);
-      before = separator;
+      addIf(!isFirst, separator).add(value);
+      isFirst = false;
     }
     return *this;
   }

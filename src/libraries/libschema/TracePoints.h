@@ -1,11 +1,10 @@
 // The trace points: one type for each traced function, with its identifier and its kind. Whether a
 // function is frequent is settled here, not at the call. Internal: included by .cpp files only.
 //
-//   int f() {
-//     tracepoint::F trace;                      // the entry record now, the exit record at every
-//     way out TRACE_DEBUG(trace, "f: reason, %s\n", text.c_str()); return trace.status(1); // a
-//     status goes into the exit record
-//   }
+// A traced function begins with its trace point: `tracepoint::ReadFile trace;` writes the entry
+// record then and the exit record at every way out. TRACE_DEBUG(trace, "text, %s\n", text.c_str())
+// writes a debug record, and a function with a status leaves by `return trace.status(1);`, which
+// puts it into the exit record.
 
 #ifndef LIBSCHEMA_TRACE_POINTS_H
 #define LIBSCHEMA_TRACE_POINTS_H

@@ -107,9 +107,9 @@ inline std::size_t CSymbolTable::bucketOf(std::string_view text) {
   if (text.empty()) {
     return 0;
   }
-  const auto first = static_cast<unsigned char>(text.front());
-  const auto last = static_cast<unsigned char>(text.back());
-  return (text.size() * 7 + first * 3U + last) % kBuckets;
+  const std::size_t first = static_cast<unsigned char>(text.front());
+  const std::size_t last = static_cast<unsigned char>(text.back());
+  return (text.size() * 7 + first * 3 + last) % kBuckets;
 }
 
 inline const CSymbolTable::Entry* CSymbolTable::entryAt(int index) const {
