@@ -5,7 +5,7 @@
 {
   packages_to_build=(g++ cmake ninja-build libcli11-dev)
   packages_to_test=(libgtest-dev libldap-dev pkg-config valgrind man-db)
-  packages_to_check=(clang clang-tidy clang-format)
+  packages_to_check=(clang clang-tidy clang-format libbenchmark-dev)
 }
 
 # missing_packages PACKAGE...: those that are not installed, one on a line.
