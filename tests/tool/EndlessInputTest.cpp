@@ -207,9 +207,9 @@ Reading check(const support::TemporaryDirectory& directory, const std::string& t
 TEST(EndlessInputAtRandom, IsForeseenAsTheLibraryReads) {
   RandomInput random(2);
   const support::TemporaryDirectory directory;
-  Sample endless(40);
+  Sample endless(50);
   int counts[3] = {};
-  for (int round = 0; round < 3000 && !testing::Test::HasFailure(); ++round) {
+  for (int round = 0; round < 2000 && !testing::Test::HasFailure(); ++round) {
     const std::string text = round % 4 == 0 ? random.pieces() : random.damagedDefinitions();
     SCOPED_TRACE("round " + std::to_string(round));
     ++counts[static_cast<int>(check(directory, text, &endless))];
@@ -228,7 +228,7 @@ TEST(EndlessInputCutShort, IsForeseenAsTheLibraryReads) {
       "ORVAttributetypes=( 1.1 DBNAME ( 'a' 'a' ) ACCESS-CLASS normal LENGTH 3 EQUALITY )\n"
       "ORVAttributetypes { ( 1.2 DBNAME ( 'f' )\n( 1.3 REVERSE ) }\n# end";
   const support::TemporaryDirectory directory;
-  Sample endless(10);
+  Sample endless(25);
   for (std::size_t length = 0; length <= text.size(); ++length) {
     SCOPED_TRACE("first " + std::to_string(length) + " bytes");
     check(directory, text.substr(0, length), &endless);

@@ -61,7 +61,7 @@ std::string placesIn(const std::string& text) {
 TEST(TokenReader, ReturnsTheTokensOfTheLibrary) {
   RandomInput random(1);
   const support::TemporaryDirectory directory;
-  for (int round = 0; round < 4000; ++round) {
+  for (int round = 0; round < 2000; ++round) {
     const std::string text = round % 2 == 0 ? random.pieces() : random.damagedDefinitions();
     SCOPED_TRACE("round " + std::to_string(round) + ":\n" + text);
     const std::string path = directory.write("text", text);

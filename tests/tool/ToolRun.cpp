@@ -2,6 +2,8 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#include <linux/capability.h>
+#include <sys/prctl.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -37,6 +39,14 @@ void redirect(const std::string& path, int descriptor) {
 }
 
 }  // namespace
+
+// The capabilities that let root pass over permissions are not got back by starting a program.
+void obeyPermissions() {
+  if (::geteuid() == 0 && (::prctl(PR_CAPBSET_DROP, CAP_DAC_OVERRIDE) != 0 ||
+                           ::prctl(PR_CAPBSET_DROP, CAP_DAC_READ_SEARCH) != 0)) {
+    ::_exit(125);
+  }
+}
 
 int exitCodeOf(pid_t process) {
   int status = 0;

@@ -59,6 +59,10 @@ class ToolFolder {
   support::TemporaryDirectory m_folder;
 };
 
+// To be called in `prepare`: lets permissions hold for the program that is started, if it is
+// root's.
+void obeyPermissions();
+
 // The exit code of a process that is waited for here.
 int exitCodeOf(pid_t process);
 
