@@ -283,7 +283,7 @@ TEST(ObjectClassEquality, ListsAreComparedFromOneSideOnly) {
   }
 }
 
-// "prefix0 prefix1 …", forwards or backwards.
+// "prefix0 prefix1 ...", forwards or backwards.
 std::string longList(const std::string& prefix, bool isForwards) {
   std::string list;
   for (int i = 0; i < 4000; ++i) {
