@@ -243,9 +243,7 @@ TEST(AttributeMembers, DeletedThroughTheBaseClass) {
 
 // What attrsEqual gives from the left to the right and back.
 std::string equalBothWays(const Attribute& left, const Attribute& right) {
-  Attribute a = left;
-  Attribute b = right;
-  return std::to_string(a.attrsEqual(right)) + " " + std::to_string(b.attrsEqual(left));
+  return std::to_string(left.attrsEqual(right)) + " " + std::to_string(right.attrsEqual(left));
 }
 
 struct EqualityCase {

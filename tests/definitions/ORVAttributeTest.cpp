@@ -196,7 +196,7 @@ TEST(ORVAttributeMembers, DeletedThroughTheBaseClass) {
 }
 
 // What orvAttrsEqual gives from the left to the right and back.
-std::string equalBothWays(ORVAttribute left, ORVAttribute right) {
+std::string equalBothWays(const ORVAttribute& left, const ORVAttribute& right) {
   return std::to_string(left.orvAttrsEqual(right) ? 1 : 0) + " " +
          std::to_string(right.orvAttrsEqual(left) ? 1 : 0);
 }

@@ -200,7 +200,7 @@ TEST(ObjectClassMembers, DeletedThroughTheBaseClass) {
 }
 
 // What objsEqual gives from the left to the right and back.
-std::string equalBothWays(ObjectClass left, ObjectClass right) {
+std::string equalBothWays(const ObjectClass& left, const ObjectClass& right) {
   return std::to_string(left.objsEqual(right) ? 1 : 0) + " " +
          std::to_string(right.objsEqual(left) ? 1 : 0);
 }
