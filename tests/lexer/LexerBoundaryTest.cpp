@@ -49,7 +49,7 @@ TEST(Boundary, MixedTextIsReadAsWritten) { EXPECT_EQ(linesOf(mixedText()), mixed
 TEST(Boundary, BlanksBeforeATextChangeNothing) {
   const std::string expected = mixedTokens(1);
   const std::size_t length = mixedText().size();
-  for (const std::size_t boundary : {1024U, 4096U, 8191U, 8192U, 16382U, 16384U, 65536U}) {
+  for (const std::size_t boundary : {1024U, 4096U, 8191U, 8192U, 16382U, 16384U, 32768U, 65536U}) {
     for (std::size_t cut = 0; cut <= length + 2; ++cut) {
       const std::size_t padding = boundary - (length + 1 - cut);
       ASSERT_EQ(linesOf(std::string(padding, ' ') + mixedText()), expected) << padding << " blanks";
@@ -73,9 +73,10 @@ TEST(Boundary, CommentBeforeATextOnlyMovesItsLines) {
 }
 
 // Lengths around the sizes that a buffer may have.
-const std::size_t kSizes[] = {1022,  1023,  1024,  4094,  4095,  4096,  4097,  8189,  8190,
-                              8191,  8192,  8193,  8194,  12288, 16381, 16382, 16383, 16384,
-                              16385, 24573, 24576, 32764, 32768, 65535, 65536, 65537, 100000};
+const std::size_t kSizes[] = {1022,  1023,  1024,  4094,  4095,  4096,  4097,  8189,
+                              8190,  8191,  8192,  8193,  8194,  12288, 16381, 16382,
+                              16383, 16384, 16385, 24573, 24576, 32764, 32765, 32766,
+                              32767, 32768, 65532, 65535, 65536, 65537, 100000};
 
 TEST(Boundary, LongQuotedStringIsWhole) {
   for (const std::size_t size : kSizes) {

@@ -3,14 +3,22 @@
 #include <fcntl.h>
 #include <gtest/gtest.h>
 #include <linux/capability.h>
+#include <linux/filter.h>
+#include <linux/seccomp.h>
 #include <sys/prctl.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
+#include <cstddef>
+#include <cstdint>
 #include <cstdlib>
 #include <filesystem>
+#include <fstream>
+#include <set>
+#include <sstream>
 
 namespace {
 
@@ -28,6 +36,19 @@ std::string withoutTimeStamp(const std::string& text) {
     return text;
   }
   return kHeader + text.substr(text.find('\n') + 1);
+}
+
+// Kind, mode and owner; of a regular file also the time of its last change, and its text.
+std::string described(const std::string& path) {
+  struct stat status {};
+  EXPECT_EQ(0, ::lstat(path.c_str(), &status)) << path;
+  std::ostringstream text;
+  text << std::oct << " mode " << status.st_mode << std::dec << " owner " << status.st_uid << "\n";
+  if (S_ISREG(status.st_mode)) {
+    text << status.st_mtim.tv_sec << "." << status.st_mtim.tv_nsec << "\n"
+         << std::ifstream(path, std::ios::binary).rdbuf() << "\n";
+  }
+  return text.str();
 }
 
 void redirect(const std::string& path, int descriptor) {
@@ -48,9 +69,30 @@ void obeyPermissions() {
   }
 }
 
-int exitCodeOf(pid_t process) {
+void failSystemCalls(const std::vector<int>& calls, int error) {
+  std::vector<sock_filter> filter = {
+      BPF_STMT(BPF_LD | BPF_W | BPF_ABS, offsetof(seccomp_data, nr)),
+  };
+  for (const int call : calls) {
+    filter.push_back(BPF_JUMP(BPF_JMP | BPF_JEQ | BPF_K, static_cast<std::uint32_t>(call), 0, 1));
+    filter.push_back(
+        BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ERRNO | static_cast<std::uint32_t>(error)));
+  }
+  filter.push_back(BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ALLOW));
+  const sock_fprog program{static_cast<unsigned short>(filter.size()), filter.data()};
+  if (::prctl(PR_SET_NO_NEW_PRIVS, 1, 0, 0, 0) != 0 ||
+      ::prctl(PR_SET_SECCOMP, SECCOMP_MODE_FILTER, &program) != 0) {
+    ::_exit(125);
+  }
+}
+
+int exitCodeOf(pid_t process, std::size_t* peakBytes) {
   int status = 0;
-  EXPECT_EQ(process, ::waitpid(process, &status, 0));
+  rusage usage{};
+  EXPECT_EQ(process, ::wait4(process, &status, 0, &usage));
+  if (peakBytes != nullptr) {
+    *peakBytes = static_cast<std::size_t>(usage.ru_maxrss) * 1024;
+  }
   return WIFSIGNALED(status) ? 128 + WTERMSIG(status) : WEXITSTATUS(status);
 }
 
@@ -67,7 +109,7 @@ void ToolFolder::install(const std::string& name, const Files& files) const {
 
 pid_t ToolFolder::start(const std::vector<std::string>& arguments, const std::string& out,
                         const std::string& err, const std::function<void()>& prepare) const {
-  std::vector<std::string> words = {SCHEMA_MIGRATE};
+  std::vector<std::string> words = {m_program};
   for (const std::string& argument : arguments) {
     words.push_back(withPath(argument));
   }
@@ -84,7 +126,7 @@ pid_t ToolFolder::start(const std::vector<std::string>& arguments, const std::st
     if (prepare) {
       prepare();
     }
-    ::execv(SCHEMA_MIGRATE, pointers.data());
+    ::execv(m_program.c_str(), pointers.data());
     ::_exit(127);
   }
   return child;
@@ -95,7 +137,7 @@ ToolResult ToolFolder::run(const std::vector<std::string>& arguments,
   const std::string out = file(".stdout");
   const std::string err = file(".stderr");
   ToolResult result;
-  result.exitCode = exitCodeOf(start(arguments, out, err, prepare));
+  result.exitCode = exitCodeOf(start(arguments, out, err, prepare), &result.peakBytes);
   result.out = withoutPath(support::readWholeFile(out));
   result.err = withoutPath(support::readWholeFile(err));
   return result;
@@ -109,9 +151,18 @@ ToolResult ToolFolder::migrate(const std::vector<std::string>& more,
   return run(arguments, prepare);
 }
 
-pid_t ToolFolder::startMigrate(const std::string& out) const {
-  return start({"migrate", "--from", "@/old", "--to", "@/new", "--out", "@/" + out},
-               file(".stdout-" + out), file(".stderr-" + out), nullptr);
+pid_t ToolFolder::startMigrate(const std::string& old, const std::string& out,
+                               const std::function<void()>& prepare) const {
+  return start({"migrate", "--from", "@/" + old, "--to", "@/new", "--out", "@/" + out},
+               file(".std-out-" + out), file(".std-err-" + out), prepare);
+}
+
+std::string ToolFolder::printedBy(const std::string& out) const {
+  return withoutPath(support::readWholeFile(file(".std-out-" + out)));
+}
+
+std::string ToolFolder::complaintsOf(const std::string& out) const {
+  return withoutPath(support::readWholeFile(file(".std-err-" + out)));
 }
 
 ToolFolder::Files ToolFolder::contents(const std::string& name) const {
@@ -138,6 +189,21 @@ std::string ToolFolder::names() const {
   std::string text;
   for (const std::string& name : names) {
     text += (text.empty() ? "" : " ") + name;
+  }
+  return text;
+}
+
+std::string ToolFolder::snapshot() const {
+  std::set<std::string> entries;
+  for (const auto& entry : std::filesystem::recursive_directory_iterator(path())) {
+    const std::string name = entry.path().string().substr(path().size() + 1);
+    if (name.compare(0, 4, ".std") != 0) {
+      entries.insert(name + described(entry.path().string()));
+    }
+  }
+  std::string text;
+  for (const std::string& entry : entries) {
+    text += entry;
   }
   return text;
 }

@@ -2,11 +2,14 @@
 
 #include <clocale>
 #include <ios>
+#include <memory>
 #include <utility>
 
 #include "TokenScanner.h"
 #include "TracePoints.h"
 
+using libschema::BufferAccess;
+using libschema::BufferedToken;
 using libschema::Scanned;
 
 namespace {
@@ -38,6 +41,9 @@ SchemaLexan::SchemaLexan(std::string directory, std::string fileName) {
               localeName(changed));
 
   m_working_dir = std::move(directory);
+  auto table = std::make_unique<SchemaSymbolTable>();
+  // One byte stays free: a zero can always stand behind what the stream has read.
+  m_input.rdbuf()->pubsetbuf(table->inputRoom(), CSymbolTable::kInputRoom - 1);
   m_input.open(m_working_dir + "/" + fileName);
   m_input.unsetf(std::ios_base::skipws);
   if (m_input.is_open()) {
@@ -49,7 +55,7 @@ SchemaLexan::SchemaLexan(std::string directory, std::string fileName) {
     }
   }
   m_line_num = 1;
-  m_symtable = new SchemaSymbolTable;
+  m_symtable = table.release();
   m_scratch_index = m_symtable->getTableSize();
   m_filename = std::move(fileName);
 }
@@ -60,6 +66,8 @@ SchemaLexan::~SchemaLexan() {
   std::setlocale(LC_ALL, "");
   TRACE_DEBUG(ldtr_fun, "lexan: locale settings after resetting is: %s",
               localeName(std::setlocale(LC_ALL, nullptr)));
+  // The stream's buffer goes with the table.
+  m_input.close();
   delete m_symtable;
 }
 
@@ -76,21 +84,30 @@ int SchemaLexan::lexan() {
 // At the end of the input m_lookahead stays what it was. m_tokenvalindex becomes -1 when the end is
 // met between tokens, and stays too when a token that the end cuts short is dropped.
 int SchemaLexan::nextToken() {
-  int token = TOKEN_END;
   if (m_input.good()) {
     // Nearly every token lies in the stream's buffer as a whole.
-    libschema::BufferedInput buffered(*m_input.rdbuf());
-    int lineNumber = m_line_num;
-    const Scanned scanned = libschema::scanToken(&buffered, &lineNumber, &token);
-    if (!buffered.isShort()) {
-      buffered.advance(m_input.rdbuf());
-      m_line_num = lineNumber;
-      return takeToken(scanned == Scanned::kText, buffered.text(), true, token);
+    std::streambuf* const buffer = m_input.rdbuf();
+    const char* const next = BufferAccess::next(*buffer);
+    char* const end = BufferAccess::end(*buffer);
+    if (m_symtable->hasInputRoomAt(end)) {
+      *end = '\0';
+      const BufferedToken token = libschema::tokenInBuffer(next, end);
+      if (token.next != nullptr) {
+        BufferAccess::advance(buffer, static_cast<int>(token.next - next));
+        m_line_num += token.lines;
+        return token.text == nullptr
+                   ? takeCharacter(token.code)
+                   : takeText(std::string_view(token.text, token.size), true, token.code);
+      }
     }
-  }
-  if (m_input.eof()) {
+  } else if (m_input.eof()) {
     return TOKEN_END;
   }
+  return nextTokenOfStream();
+}
+
+int SchemaLexan::nextTokenOfStream() {
+  int token = TOKEN_END;
   libschema::StreamInput input(&m_input, m_symtable);
   switch (libschema::scanToken(&input, &m_line_num, &token)) {
     case Scanned::kEndBetweenTokens:
@@ -99,32 +116,34 @@ int SchemaLexan::nextToken() {
     case Scanned::kEndWithinToken:
       return TOKEN_END;
     case Scanned::kCharacter:
-      return takeToken(false, {}, false, token);
+      return takeCharacter(token);
     case Scanned::kText:
       break;
   }
-  return takeToken(true, input.text(), input.isTextInBuffer(), token);
+  return takeText(input.text(), input.isTextInBuffer(), token);
 }
 
-// Makes a character, or a text, the current token. The scratch entry takes part in the look-up of a
-// text: one equal to the text stored before is that entry, with the code that it had then. A text
-// in the stream's buffer is not copied to the table as long as it stays there.
-int SchemaLexan::takeToken(bool hasText, std::string_view text, bool isInBuffer, int token) {
-  int index = -1;
-  if (hasText) {
-    const std::size_t bucket = CSymbolTable::bucketOf(text);
-    index = m_symtable->findText(text, bucket);
-    if (index < 0 && token == TOKEN_NAME) {
-      const std::string_view keyword = foldStart(text);
-      index = keyword.empty() ? -1 : m_symtable->findText(keyword, CSymbolTable::bucketOf(keyword));
-    }
-    if (index < 0) {
-      index = isInBuffer ? m_symtable->replaceBorrowed(m_scratch_index, text, bucket, token)
-                         : m_symtable->replaceText(m_scratch_index, text, token);
-      m_scratch_index = index;
-    } else {
-      token = m_symtable->getTokenValue(index);
-    }
+int SchemaLexan::takeCharacter(int token) {
+  m_tokenvalindex = -1;
+  m_lookahead = token;
+  return token;
+}
+
+// Makes a text the current token. The scratch entry takes part in the look-up: a text equal to the
+// one stored before is that entry, with the code that it had then. A text in the stream's buffer is
+// not copied to the table as long as it stays there.
+int SchemaLexan::takeText(std::string_view text, bool isInBuffer, int token) {
+  int index = m_symtable->findText(text);
+  if (index < 0 && token == TOKEN_NAME) {
+    const std::string_view keyword = foldStart(text);
+    index = keyword.empty() ? -1 : m_symtable->findText(keyword);
+  }
+  if (index < 0) {
+    index = isInBuffer ? m_symtable->replaceBorrowed(m_scratch_index, text, token)
+                       : m_symtable->replaceText(m_scratch_index, text, token);
+    m_scratch_index = index;
+  } else {
+    token = m_symtable->getTokenValue(index);
   }
   m_tokenvalindex = index;
   m_lookahead = token;

@@ -69,7 +69,9 @@ class SchemaLexan : public Clex_analyzer {
 
  private:
   int nextToken();
-  int takeToken(bool hasText, std::string_view text, bool isInBuffer, int token);
+  int nextTokenOfStream();
+  int takeCharacter(int token);
+  int takeText(std::string_view text, bool isInBuffer, int token);
 };
 
 #endif  // LIBSCHEMA_SCHEMA_LEXAN_H

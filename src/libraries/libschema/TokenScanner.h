@@ -1,10 +1,11 @@
-// The shapes of tokens, character by character, over the buffer of the input stream. Internal:
-// included by .cpp files only.
+// The shapes of tokens: as they stand in the input stream, character by character, and, for nearly
+// every token, as they stand in its buffer. Internal: included by .cpp files only.
 
 #ifndef LIBSCHEMA_TOKEN_SCANNER_H
 #define LIBSCHEMA_TOKEN_SCANNER_H
 
 #include <array>
+#include <cstring>
 #include <fstream>
 #include <streambuf>
 #include <string>
@@ -49,10 +50,30 @@ inline bool isOf(char c, ByteClass byteClass) {
   return (kByteClasses[static_cast<unsigned char>(c)] & byteClass) != 0;
 }
 
+// What a token that begins with a byte is, where the byte is not passed over.
+enum class Start : unsigned char { kCharacter, kBlank, kNewline, kComment, kNumber, kWord, kQuote };
+
+constexpr std::array<Start, 256> classifyStarts() {
+  std::array<Start, 256> starts{};
+  for (std::size_t c = 0; c < 256; ++c) {
+    const unsigned char classes = kByteClasses[c];
+    starts[c] = c == '\''                     ? Start::kQuote
+                : c == '\n'                   ? Start::kNewline
+                : c == '#'                    ? Start::kComment
+                : (classes & kBlank) != 0     ? Start::kBlank
+                : (classes & kDigit) != 0     ? Start::kNumber
+                : (classes & kWordStart) != 0 ? Start::kWord
+                                              : Start::kCharacter;
+  }
+  return starts;
+}
+
+constexpr std::array<Start, 256> kStarts = classifyStarts();
+
 // The protected members of a stream buffer, by name.
 struct BufferAccess : std::streambuf {
   static const char* next(const std::streambuf& buffer) { return (buffer.*&BufferAccess::gptr)(); }
-  static const char* end(const std::streambuf& buffer) { return (buffer.*&BufferAccess::egptr)(); }
+  static char* end(const std::streambuf& buffer) { return (buffer.*&BufferAccess::egptr)(); }
   static void advance(std::streambuf* buffer, int count) { (buffer->*&BufferAccess::gbump)(count); }
 };
 
@@ -79,85 +100,11 @@ inline const char* endOfRun(const char* place, const char* end, ByteClass byteCl
   return place;
 }
 
-// ---- Two kinds of input, for scanToken ----
-//
-//   read()        makes the next character current; false when there is none, and the character
-//   stays current()     the character read last atEnd()       whether a read met the end
-//   putBack()     gives the current character back, unless the last read failed
-//   passRun(k)    passes over the characters of class k that lie ahead in the buffer
-//   skipRun(k)    passes over characters of class k, the current one included, to the first other
-//   one;
-//                 false when the input ends there
-//   takeRun(k)    the same, appending them to the text
-//   take()        appends the current character to the text and reads on
-//   text()        the text gathered so far
+// ---- The stream ----
 
-// What lies in the stream's buffer already. A token that needs more, or whose text is not in one
-// piece, makes it short: then nothing is to be used, and the stream is still where it was.
-class BufferedInput {
- public:
-  explicit BufferedInput(const std::streambuf& buffer)
-      : m_start(BufferAccess::next(buffer)), m_next(m_start), m_end(BufferAccess::end(buffer)) {}
-
-  bool isShort() const { return m_isShort; }
-  void advance(std::streambuf* buffer) const {
-    BufferAccess::advance(buffer, static_cast<int>(m_next - m_start));
-  }
-
-  char current() const { return m_current; }
-  bool atEnd() const { return m_isShort; }
-  bool read() {
-    if (m_next == m_end) {
-      m_isShort = true;
-      return false;
-    }
-    m_current = *m_next++;
-    return true;
-  }
-  void putBack() { --m_next; }
-  void passRun(ByteClass byteClass) { m_next = endOfRun(m_next, m_end, byteClass); }
-  bool skipRun(ByteClass byteClass) {
-    if (isOf(m_current, byteClass)) {
-      passRun(byteClass);
-      return read();
-    }
-    return true;
-  }
-  bool takeRun(ByteClass byteClass) {
-    if (!isOf(m_current, byteClass)) {
-      return true;
-    }
-    const char* const from = m_next - 1;
-    passRun(byteClass);
-    return append(from) && read();
-  }
-  bool take() { return append(m_next - 1) && read(); }
-  std::string_view text() const { return m_text; }
-
- private:
-  bool append(const char* from) {
-    const auto count = static_cast<std::size_t>(m_next - from);
-    if (m_text.empty()) {
-      m_text = std::string_view(from, count);
-    } else if (m_text.data() + m_text.size() == from) {
-      m_text = std::string_view(m_text.data(), m_text.size() + count);
-    } else {
-      m_isShort = true;
-    }
-    return !m_isShort;
-  }
-
-  const char* m_start;
-  const char* m_next;
-  const char* m_end;
-  std::string_view m_text;
-  char m_current = '\0';
-  bool m_isShort = false;
-};
-
-// The stream itself. A read that fails leaves the stream at end of file (or, after an input
-// error, bad); every later read fails too. The stream stands behind what was read once the object
-// is gone.
+// The stream, character by character. A read that fails leaves the stream at end of file (or,
+// after an input error, bad); every later read fails too. The stream stands behind what was read
+// once the object is gone.
 class StreamInput {
  public:
   // Before the buffer is filled anew, `table` is told to keep what it borrows from it.
@@ -171,8 +118,11 @@ class StreamInput {
   StreamInput& operator=(const StreamInput&) = delete;
   ~StreamInput() { giveBack(); }
 
+  // The character read last, and whether a read met the end.
   char current() const { return m_current; }
   bool atEnd() const { return m_input->eof(); }
+
+  // Makes the next character current; false when there is none, and the character stays.
   bool read() {
     if (m_next == m_end && !refill()) {
       return false;
@@ -180,12 +130,17 @@ class StreamInput {
     m_current = *m_next++;
     return true;
   }
+  // Gives the current character back, unless the last read failed.
   void putBack() {
     if (m_input->good()) {
       --m_next;
     }
   }
+  // Passes over the characters of the class that lie ahead in the buffer.
   void passRun(ByteClass byteClass) { m_next = endOfRun(m_next, m_end, byteClass); }
+
+  // Passes over characters of the class, the current one included, to the first other one; false
+  // when the input ends there.
   bool skipRun(ByteClass byteClass) {
     while (isOf(m_current, byteClass)) {
       passRun(byteClass);
@@ -195,6 +150,7 @@ class StreamInput {
     }
     return true;
   }
+  // The same, appending them to the text.
   bool takeRun(ByteClass byteClass) {
     while (isOf(m_current, byteClass)) {
       const char* const from = m_next - 1;
@@ -206,10 +162,12 @@ class StreamInput {
     }
     return true;
   }
+  // Appends the current character to the text and reads on.
   bool take() {
     append(m_next - 1);
     return read();
   }
+  // The text gathered so far; whether it is a piece of the stream's buffer.
   std::string_view text() const { return m_isKept ? std::string_view(m_kept) : m_text; }
   bool isTextInBuffer() const { return !m_isKept; }
 
@@ -288,8 +246,7 @@ enum class Scanned {
 
 // Reads a number from its first digit on; leaves the character after it current. Returns the
 // code.
-template <typename Input>
-int scanNumber(Input* input) {
+inline int scanNumber(StreamInput* input) {
   input->takeRun(kNumberPart);
   while (input->current() == ' ' && input->read()) {
   }
@@ -310,8 +267,7 @@ int scanNumber(Input* input) {
 
 // Reads a word or a quoted string; leaves the character after it current. Whatever ends a quoted
 // string, its closing quote or not, is dropped, and a newline dropped so is not counted.
-template <typename Input>
-int scanWord(Input* input) {
+inline int scanWord(StreamInput* input) {
   if (input->current() == '\'') {
     input->read();
     input->takeRun(kQuotedPart);
@@ -322,9 +278,9 @@ int scanWord(Input* input) {
   return TOKEN_NAME;
 }
 
-// Reads one token, counts the lines before it, and puts back the character that ends it.
-template <typename Input>
-Scanned scanToken(Input* input, int* lineNumber, int* code) {
+// Reads one token of the stream, counts the lines before it, and puts back the character that ends
+// it.
+inline Scanned scanToken(StreamInput* input, int* lineNumber, int* code) {
   for (;;) {
     if (!input->read()) {
       return Scanned::kEndBetweenTokens;
@@ -348,6 +304,92 @@ Scanned scanToken(Input* input, int* lineNumber, int* code) {
     } else {
       *code = c;
       return Scanned::kCharacter;
+    }
+  }
+}
+
+// ---- Tokens in the buffer ----
+
+// A token that lies in the buffer as a whole, with the character after it.
+struct BufferedToken {
+  const char* next;  // behind the token; null when it is not such a one, and no other member holds
+  const char* text;  // where its text begins; null when it is a character
+  std::size_t size;
+  int code;
+  int lines;  // how many end before it
+};
+
+// The first place from `place` on that is not of the class. A zero byte, which is of none but
+// kCommentPart, stands behind the buffer.
+inline const char* endOfRunAtZero(const char* place, ByteClass byteClass) {
+  while (isOf(*place, byteClass)) {
+    ++place;
+  }
+  return place;
+}
+
+// Reads a number in the buffer, with the blanks after it. One whose length is not complete, or
+// stands behind blanks, is left to the stream.
+inline BufferedToken numberInBuffer(const char* text, const char* end, int lines) {
+  const char* next = endOfRunAtZero(text, kNumberPart);
+  auto size = static_cast<std::size_t>(next - text);
+  int code = TOKEN_NUMBER;
+  if (*next == '{') {
+    const char* const brace = endOfRunAtZero(next + 1, kDigit);
+    if (*brace != '}' || brace == next + 1) {
+      return {};
+    }
+    next = brace + 1;
+    size = static_cast<std::size_t>(next - text);
+    code = TOKEN_NUMBER_LENGTH;
+  } else {
+    while (*next == ' ') {
+      ++next;
+    }
+    if (*next == '{') {
+      return {};
+    }
+  }
+  return {next == end ? nullptr : next, text, size, code, lines};
+}
+
+// Reads the token that begins at `next`, as scanToken would. `end` is the end of the buffer, behind
+// which a zero byte stands.
+inline BufferedToken tokenInBuffer(const char* next, const char* end) {
+  for (int lines = 0;; ++next) {
+    // One blank stands before most tokens.
+    next += *next == ' ' ? 1 : 0;
+    switch (kStarts[static_cast<unsigned char>(*next)]) {
+      case Start::kBlank:
+        continue;
+      case Start::kNewline:
+        ++lines;
+        continue;
+      case Start::kComment: {
+        next =
+            static_cast<const char*>(std::memchr(next, '\n', static_cast<std::size_t>(end - next)));
+        if (next == nullptr) {
+          return {};
+        }
+        ++lines;
+        continue;
+      }
+      case Start::kNumber:
+        return numberInBuffer(next, end, lines);
+      case Start::kWord: {
+        const char* const behind = endOfRunAtZero(next, kWordPart);
+        return {behind == end ? nullptr : behind, next, static_cast<std::size_t>(behind - next),
+                TOKEN_NAME, lines};
+      }
+      case Start::kQuote: {
+        const char* const text = next + 1;
+        const char* const quote = endOfRunAtZero(text, kQuotedPart);
+        const bool isWhole = quote != end && quote + 1 != end;
+        return {isWhole ? quote + 1 : nullptr, text, static_cast<std::size_t>(quote - text),
+                TOKEN_NAME, lines};
+      }
+      case Start::kCharacter:
+        return {next == end ? nullptr : next + 1, nullptr, 0, *next, lines};
     }
   }
 }

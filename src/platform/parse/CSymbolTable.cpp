@@ -1,8 +1,14 @@
 #include "CSymbolTable.h"
 
+#include <utility>
+
 #include "DiagnosticFile.h"
 
-CSymbolTable::CSymbolTable() { m_buckets.fill(-1); }
+CSymbolTable::CSymbolTable() {
+  constexpr std::size_t kUsualEntries = 32;
+  m_entries.reserve(kUsualEntries);
+  m_buckets.fill(-1);
+}
 
 CSymbolTable::~CSymbolTable() = default;
 
@@ -15,7 +21,6 @@ CSymbolTable::Entry* CSymbolTable::appendEntry(Kind kind, int token, bool isKeyw
   entry->isKeyword = isKeyword;
   entry->token = token;
   entry->next = -1;
-  entry->borrowed = {};
   return entry;
 }
 
@@ -26,14 +31,14 @@ int CSymbolTable::insertValue(std::string value, int token, bool isKeyword) {
 int CSymbolTable::insertText(std::string_view text, int token, bool isKeyword) {
   Entry* entry = appendEntry(Kind::kNone, token, isKeyword);
   try {
-    entry->kept.assign(text);
+    entry->text.assign(text);
   } catch (...) {
     --m_used;
     throw;
   }
   entry->kind = Kind::kString;
   const int index = static_cast<int>(m_used) - 1;
-  link(index, bucketOf(text));
+  link(index);
   return index;
 }
 
@@ -42,24 +47,26 @@ int CSymbolTable::replaceText(int index, std::string_view text, int token) {
   return insertText(text, token, false);
 }
 
-int CSymbolTable::addBorrowed(int index, std::string_view text, std::size_t bucket, int token) {
-  if (text.empty()) {
-    return replaceText(index, text, token);
-  }
+int CSymbolTable::addBorrowed(int index, std::string_view text, int token) {
   removeValue(index);
   keepBorrowed();
-  appendEntry(Kind::kString, token, false)->borrowed = text;
+  appendEntry(Kind::kString, token, false);
   m_borrower = static_cast<int>(m_used) - 1;
-  link(m_borrower, bucket);
+  m_borrowed = text;
   return m_borrower;
+}
+
+char* CSymbolTable::inputRoom() {
+  if (m_inputRoom == nullptr) {
+    m_inputRoom.reset(new char[kInputRoom]);
+  }
+  return m_inputRoom.get();
 }
 
 void CSymbolTable::keepBorrowed() {
   if (m_borrower >= 0) {
-    Entry& entry = m_entries[static_cast<std::size_t>(m_borrower)];
-    entry.kept.assign(entry.borrowed);
-    entry.borrowed = {};
-    m_borrower = -1;
+    m_entries[static_cast<std::size_t>(m_borrower)].text.assign(m_borrowed);
+    link(std::exchange(m_borrower, -1));
   }
 }
 
@@ -68,7 +75,7 @@ int CSymbolTable::insertValue(char value, int token, bool isKeyword) {
   return static_cast<int>(m_used) - 1;
 }
 
-int CSymbolTable::lookUpValue(std::string value) { return findText(value, bucketOf(value)); }
+int CSymbolTable::lookUpValue(std::string value) { return findText(value); }
 
 bool CSymbolTable::getValue(int index, char& out) {
   if (!isCharacter(index)) {
@@ -88,19 +95,37 @@ bool CSymbolTable::isCharacter(int index) {
   return entry != nullptr && entry->kind == Kind::kCharacter;
 }
 
+// Puts the entry into its bucket so that a look-up meets the lowest index first.
+void CSymbolTable::link(int index) {
+  Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  int* place = &m_buckets[bucketOf(entry.text)];
+  while (*place >= 0 && *place < index) {
+    place = &m_entries[static_cast<std::size_t>(*place)].next;
+  }
+  entry.next = *place;
+  *place = index;
+}
+
+void CSymbolTable::unlink(int index) {
+  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  int* place = &m_buckets[bucketOf(entry.text)];
+  while (*place != index) {
+    place = &m_entries[static_cast<std::size_t>(*place)].next;
+  }
+  *place = entry.next;
+}
+
 void CSymbolTable::removeValue(int index) {
   if (entryAt(index) == nullptr) {
     return;
   }
   Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  if (entry.kind == Kind::kString) {
-    unlink(index);
-  }
   if (index == m_borrower) {
     m_borrower = -1;
+  } else if (entry.kind == Kind::kString) {
+    unlink(index);
   }
   entry.kind = Kind::kNone;
-  entry.borrowed = {};
   ++m_holes;
   while (m_used > 0 && m_entries[m_used - 1].kind == Kind::kNone) {
     --m_used;
@@ -126,7 +151,7 @@ std::string CSymbolTable::describe(std::size_t index) const {
   const Entry& entry = m_entries[index];
   std::string line = std::to_string(index) + ' ' + std::to_string(entry.token) + ' ';
   if (entry.kind == Kind::kString) {
-    line.append(1, '"').append(entry.text()).append(1, '"');
+    line.append(1, '"').append(textAt(static_cast<int>(index))).append(1, '"');
   } else {
     line += std::string("'") + entry.character + "'";
   }

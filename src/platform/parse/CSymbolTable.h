@@ -8,6 +8,8 @@
 #include <array>
 #include <cstddef>
 #include <fstream>
+#include <functional>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -57,18 +59,22 @@ class CSymbolTable {
   // Writes the table to `out`, each line indented by `indent` TABs.
   void dump(int indent, std::ofstream& out);
 
-  // The same as lookUpValue and insertValue, for a caller whose text lies in a buffer of its own. A
-  // bucket, which a text always has the same, spares its second computation.
-  static std::size_t bucketOf(std::string_view text);
-  int findText(std::string_view text, std::size_t bucket) const;
+  // The same as lookUpValue and insertValue, for a caller whose text lies in a buffer of its own.
+  int findText(std::string_view text) const;
   int insertText(std::string_view text, int token, bool isKeyword);
 
   // Removes the entry `index` and adds a string entry, not as a keyword; returns the new index. A
   // borrowed text is not copied: it must stay where it is until the entry goes or keepBorrowed()
   // has copied it. One text at a time is borrowed.
   int replaceText(int index, std::string_view text, int token);
-  int replaceBorrowed(int index, std::string_view text, std::size_t bucket, int token);
+  int replaceBorrowed(int index, std::string_view text, int token);
   void keepBorrowed();
+
+  // Room of kInputRoom bytes for a reader's input, from which texts may be borrowed; it goes with
+  // the table. Whether a place lies in it.
+  static constexpr int kInputRoom = 1 << 15;
+  char* inputRoom();
+  bool hasInputRoomAt(const char* place) const;
 
  private:
   enum class Kind { kNone, kString, kCharacter };
@@ -78,28 +84,27 @@ class CSymbolTable {
     char character = '\0';
     int token = -1;
     int next = -1;  // the next string entry in the same bucket
-    std::size_t bucket = 0;
-    std::string_view borrowed;  // the text, unless its data is null
-    std::string kept;
-
-    std::string_view text() const {
-      return borrowed.data() != nullptr ? borrowed : std::string_view(kept);
-    }
+    std::string text;
   };
 
   static constexpr std::size_t kBuckets = 128;
 
   const Entry* entryAt(int index) const;
   Entry* appendEntry(Kind kind, int token, bool isKeyword);
-  void link(int index, std::size_t bucket);
+  std::string_view textAt(int index) const;
+  void link(int index);
   void unlink(int index);
-  int addBorrowed(int index, std::string_view text, std::size_t bucket, int token);
+  int addBorrowed(int index, std::string_view text, int token);
+  static std::size_t bucketOf(std::string_view text);
   std::string describe(std::size_t index) const;
 
   std::vector<Entry> m_entries;  // slots behind m_used keep their storage for the next insertion
   std::size_t m_used = 0;
   std::size_t m_holes = 0;
-  int m_borrower = -1;  // the entry whose text is borrowed
+  // The entry whose text is borrowed, which is in no bucket, and that text.
+  int m_borrower = -1;
+  std::string_view m_borrowed;
+  std::unique_ptr<char[]> m_inputRoom;
   std::array<int, kBuckets> m_buckets;
 };
 
@@ -120,16 +125,23 @@ inline const CSymbolTable::Entry* CSymbolTable::entryAt(int index) const {
   return entry.kind == Kind::kNone ? nullptr : &entry;
 }
 
-inline int CSymbolTable::findText(std::string_view text, std::size_t bucket) const {
-  int index = m_buckets[bucket];
+inline int CSymbolTable::findText(std::string_view text) const {
+  int index = m_buckets[bucketOf(text)];
   while (index >= 0) {
     const Entry& entry = m_entries[static_cast<std::size_t>(index)];
-    if (entry.text() == text) {
-      return index;
+    if (entry.text == text) {
+      break;
     }
     index = entry.next;
   }
-  return -1;
+  const bool isBorrowed = m_borrower >= 0 && m_borrowed == text;
+  return isBorrowed && (index < 0 || m_borrower < index) ? m_borrower : index;
+}
+
+inline bool CSymbolTable::hasInputRoomAt(const char* place) const {
+  const std::less<const char*> isBefore;
+  const char* const room = m_inputRoom.get();
+  return room != nullptr && !isBefore(place, room) && isBefore(place, room + kInputRoom);
 }
 
 inline int CSymbolTable::getTokenValue(int index) {
@@ -142,7 +154,7 @@ inline bool CSymbolTable::getValue(int index, std::string& out) {
   if (entry == nullptr || entry->kind != Kind::kString) {
     return false;
   }
-  const std::string_view text = entry->text();
+  const std::string_view text = textAt(index);
   if (out.capacity() < text.size()) {
     out = std::string(text);
   } else {
@@ -151,37 +163,18 @@ inline bool CSymbolTable::getValue(int index, std::string& out) {
   return true;
 }
 
-// Puts the entry last in its bucket, so that a look-up meets the lowest index first.
-inline void CSymbolTable::link(int index, std::size_t bucket) {
-  int* place = &m_buckets[bucket];
-  while (*place >= 0) {
-    place = &m_entries[static_cast<std::size_t>(*place)].next;
-  }
-  *place = index;
-  m_entries[static_cast<std::size_t>(index)].bucket = bucket;
+inline std::string_view CSymbolTable::textAt(int index) const {
+  return index == m_borrower ? m_borrowed
+                             : std::string_view(m_entries[static_cast<std::size_t>(index)].text);
 }
 
-inline void CSymbolTable::unlink(int index) {
-  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  int* place = &m_buckets[entry.bucket];
-  while (*place != index) {
-    place = &m_entries[static_cast<std::size_t>(*place)].next;
-  }
-  *place = entry.next;
-}
-
-inline int CSymbolTable::replaceBorrowed(int index, std::string_view text, std::size_t bucket,
-                                         int token) {
-  if (index != m_borrower || index < 0 || index + 1 != static_cast<int>(m_used) || text.empty()) {
-    return addBorrowed(index, text, bucket, token);
+inline int CSymbolTable::replaceBorrowed(int index, std::string_view text, int token) {
+  if (index < 0 || index != m_borrower || index + 1 != static_cast<int>(m_used)) {
+    return addBorrowed(index, text, token);
   }
   // The usual case: the last entry borrows one text after the other.
-  unlink(index);
-  Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  entry.borrowed = text;
-  entry.token = token;
-  entry.next = -1;
-  link(index, bucket);
+  m_borrowed = text;
+  m_entries[static_cast<std::size_t>(index)].token = token;
   return index;
 }
 
