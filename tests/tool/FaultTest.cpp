@@ -100,7 +100,7 @@ class Fault : public testing::Test {
 };
 
 TEST_F(Fault, KilledAtAnyMoment) {
-  for (int round = 0; round < 100; ++round) {
+  for (int round = 0; round < 200; ++round) {
     SCOPED_TRACE("round " + std::to_string(round));
     endAtRandom(SIGKILL);
     takeWholeOrNothing();
@@ -145,7 +145,7 @@ TEST_F(FaultInASmallRun, KilledAtEveryChange) {
 }
 
 TEST_F(Fault, InterruptedAtAnyMomentLeavesNothing) {
-  for (int round = 0; round < 60; ++round) {
+  for (int round = 0; round < 100; ++round) {
     SCOPED_TRACE("round " + std::to_string(round));
     const int signal = round % 2 == 0 ? SIGTERM : SIGINT;
     const int exitCode = endAtRandom(signal);
@@ -206,7 +206,7 @@ class SideBySide : public testing::Test {
   SideBySide() {
     folder.install("new", {{"V3.system.at", "attributetypes=( 1.2 NAME 's' OBSOLETE )\n"}});
     for (int run = 0; run < kRuns; ++run) {
-      std::string types = run == 2   ? "objectclasses=( 1.1\n"
+      std::string types = run == 2   ? "attributetypes=( 1.1\n"
                           : run == 5 ? "attributetypes=( 1.2 NAME 'other' OBSOLETE )\n"
                                      : "attributetypes=( 1.2 NAME 's' DESC 'changed' )\n";
       for (int i = 0; i < 500 * (run + 1); ++i) {

@@ -53,6 +53,12 @@ const Row kRows[] = {
      [](const ToolFolder& f) { std::filesystem::remove(f.file("new/V3.user.at")); },
      {},
      "@/new: error: no V3.* schema file in the directory of NEW; name the directory that holds V3.system.at and its like\n"},
+    {"NoSchemaFileInOld",
+     [](const ToolFolder& f) {
+       std::filesystem::rename(f.file("old/V3.user.at"), f.file("old/user.at"));
+     },
+     {},
+     "@/old: error: no V3.* schema file in the directory of OLD; name the directory that holds V3.system.at and its like\n"},
     {"DirectoryForAFile",
      [](const ToolFolder& f) { std::filesystem::create_directory(f.file("old/V3.user.oc")); },
      {},
@@ -67,6 +73,12 @@ const Row kRows[] = {
      },
      {},
      "@/new/V3.config.at: error: cannot be read: it is a device\n"},
+    {"NullDeviceForAFile",
+     [](const ToolFolder& f) {
+       std::filesystem::create_symlink("/dev/null", f.file("old/V3.system.oc"));
+     },
+     {},
+     "@/old/V3.system.oc: error: cannot be read: it is a device\n"},
     {"SocketForAFile",
      [](const ToolFolder& f) { makeSocket(f.file("new/V3.orv.oc")); },
      {},
@@ -105,6 +117,10 @@ const Row kRows[] = {
      [](const ToolFolder& f) { ::mkfifo(f.file("list").c_str(), 0666); },
      {"--withdraw", "@/list"},
      "@/list: error: the list of OIDs cannot be read: it is a FIFO\n"},
+    {"ListIsADevice",
+     [](const ToolFolder&) {},
+     {"--exclude-oids", "/dev/zero"},
+     "/dev/zero: error: the list of OIDs cannot be read: it is a device\n"},
     {"ListIsADirectory",
      [](const ToolFolder&) {},
      {"--withdraw", "@/old"},
@@ -122,25 +138,39 @@ TEST_P(Input, IsRefusedWithItsPlace) {
   folder.install("old", {{"V3.user.at", "attributetypes=( 1.1 NAME 'a' OBSOLETE )\n"}});
   folder.install("new", {{"V3.user.at", ""}});
   GetParam().damage(folder);
-  const std::string names = folder.names();
+  const std::string before = folder.snapshot();
   const ToolResult result = folder.migrate(GetParam().more, [] { ::alarm(20); });
   EXPECT_EQ(3, result.exitCode);
   EXPECT_EQ("", result.out);
   EXPECT_EQ(GetParam().err, result.err);
-  EXPECT_EQ(names, folder.names());
+  EXPECT_EQ(before, folder.snapshot());
 }
 
 INSTANTIATE_TEST_SUITE_P(Rows, Input, testing::ValuesIn(kRows),
                          [](const auto& row) { return std::string(row.param.name); });
 
+// What may not be read: a file of either installation, a directory, a list.
 TEST(InputWithoutPermission, IsRefused) {
-  const ToolFolder folder;
-  folder.install("old", {{"V3.user.at", ""}});
-  folder.install("new", {{"V3.user.at", ""}});
-  ASSERT_EQ(0, ::chmod(folder.file("old/V3.user.at").c_str(), 0));
-  const ToolResult result = folder.migrate({}, obeyPermissions);
-  EXPECT_EQ(3, result.exitCode);
-  EXPECT_EQ("@/old/V3.user.at: error: cannot be read: Permission denied\n", result.err);
+  const std::pair<const char*, const char*> kShut[] = {
+      {"old/V3.user.at", "@/old/V3.user.at: error: cannot be read: Permission denied\n"},
+      {"new/V3.user.oc", "@/new/V3.user.oc: error: cannot be read: Permission denied\n"},
+      {"new", "@/new: error: the directory of NEW cannot be read: Permission denied\n"},
+      {"list", "@/list: error: the list of OIDs cannot be read: Permission denied\n"},
+  };
+  for (const auto& [name, err] : kShut) {
+    SCOPED_TRACE(name);
+    const ToolFolder folder;
+    folder.install("old", {{"V3.user.at", ""}});
+    folder.install("new", {{"V3.user.at", ""}, {"V3.user.oc", ""}});
+    folder.write("list", "1.1\n");
+    ASSERT_EQ(0, ::chmod(folder.file(name).c_str(), 0));
+    const ToolResult result = folder.migrate({"--withdraw", "@/list"}, obeyPermissions);
+    EXPECT_EQ(3, result.exitCode);
+    EXPECT_EQ("", result.out);
+    EXPECT_EQ(err, result.err);
+    EXPECT_EQ("list new old", folder.names());
+    ASSERT_EQ(0, ::chmod(folder.file(name).c_str(), 0700));
+  }
 }
 
 // A comment needs no line break behind it, and blanks of every kind separate OIDs.
@@ -158,6 +188,25 @@ TEST(InputList, TakesWhatTheLibraryTakes) {
           std::string(
               "attributetypes=( 1.3 NAME ( 'c'  ) OBSOLETE USAGE userApplications  )\nattributetypes=( 1.4 NAME ( 'd'  ) OBSOLETE USAGE userApplications  )\n"),
       folder.contents("out")["V3.user.at"]);
+}
+
+// Empty files are an installation without a definition.
+TEST(InputEmpty, GivesEmptyFiles) {
+  const ToolFolder folder;
+  ToolFolder::Files nothing;
+  for (const char* const file :
+       {"V3.user.oc", "V3.user.at", "V3.orv.oc", "V3.orv.at", "V3.system.oc", "V3.system.at",
+        "V3.modifiedschema", "V3.config.at", "V3.config.oc"}) {
+    nothing[file] = "";
+  }
+  folder.install("old", nothing);
+  folder.install("new", nothing);
+  const ToolResult result = folder.migrate();
+  EXPECT_EQ(0, result.exitCode);
+  EXPECT_EQ("", result.err);
+  EXPECT_EQ(nothing, folder.contents("out"));
+  EXPECT_EQ(nothing, folder.contents("old"));
+  EXPECT_EQ(nothing, folder.contents("new"));
 }
 
 TEST(InputBytes, OddOnesBetweenDefinitionsAreNoError) {
@@ -178,28 +227,38 @@ TEST(InputBytes, OddOnesBetweenDefinitionsAreNoError) {
   }
 }
 
-// A full definition of every kind, cut off behind every byte: the run is made, or refused with a
-// place in this file; it never hangs and never leaves anything behind.
+// A definition of every kind with every clause, cut off behind every byte: the run is made, or
+// refused with a place in this file; it never hangs, never leaves anything behind, and the inputs
+// are what they were.
 TEST(InputCutShort, EndsInAResultOrAMessage) {
   const std::string text =
-      "attributetypes=( 1.1 NAME ( 'a' 'b' ) DESC 'd' SUP c SYNTAX 1.2{3} )\n"
-      "objectclasses { ( 1.4 NAME 'h' SUP i ABSTRACT MUST ( k $ l ) ) }\n"
-      "ORVAttributetypes=( 1.1 DBNAME ( 'a' 'a' ) LENGTH 3 EQUALITY )\n";
+      "attributetypes=( 1.1 NAME ( 'a' 'b' ) DESC 'd' OBSOLETE SUP c EQUALITY e ORDERING o SUBSTR s "
+      "SYNTAX 1.2{3} SINGLE-VALUE NO-USER-MODIFICATION USAGE directoryOperation )\n"
+      "objectclasses { ( 1.4 NAME ( 'h' 'g' ) DESC 'd' OBSOLETE SUP ( i $ j ) ABSTRACT MUST ( k $ l ) "
+      "MAY ( m $ n ) ) }\n"
+      "ORVAttributetypes=( 1.1 DBNAME ( 'a' 'a' ) ACCESS-CLASS normal LENGTH 3 EQUALITY ORDERING "
+      "SUBSTR APPROX REVERSE )\n";
   const ToolFolder folder;
   folder.install("new", {{"V3.user.at", ""}});
+  int read = 0;
   for (std::size_t length = 0; length <= text.size(); ++length) {
     SCOPED_TRACE("first " + std::to_string(length) + " bytes");
     folder.install("old", {{"V3.user.at", text.substr(0, length)}});
+    const std::string before = folder.snapshot();
     const ToolResult result = folder.migrate({}, [] { ::alarm(20); });
     if (result.exitCode == 0) {
       EXPECT_EQ(7U, folder.contents("out").size());
       std::filesystem::remove_all(folder.file("out"));
+      ++read;
     } else {
       EXPECT_EQ(3, result.exitCode);
+      EXPECT_EQ("", result.out);
       EXPECT_EQ(0U, result.err.find("@/old/V3.user.at:")) << result.err;
     }
-    ASSERT_EQ("new old", folder.names());
+    ASSERT_EQ(before, folder.snapshot());
   }
+  EXPECT_GT(read, 20);
+  EXPECT_LT(read, 60);
 }
 
 }  // namespace

@@ -1,0 +1,22 @@
+// A run of schema-migrate that is killed at a chosen system call.
+
+#ifndef LIBSCHEMA_TESTS_TRACED_RUN_H
+#define LIBSCHEMA_TESTS_TRACED_RUN_H
+
+#include <sys/types.h>
+
+// When, counted in the system calls by which the program changes something in a file system: files
+// and directories made, written, given a mode, brought to the disk, renamed or removed.
+struct Moment {
+  int change;     // from 1
+  bool isBehind;  // when the call has taken effect, or before it does
+};
+
+// To be called in `prepare`, for killAt() to take the program over.
+void waitForTracer();
+
+// Lets the program go on until then, and ends it with SIGKILL; returns false when it came to its
+// end before, with its exit code in *exitCode.
+bool killAt(pid_t process, const Moment& moment, int* exitCode);
+
+#endif  // LIBSCHEMA_TESTS_TRACED_RUN_H
