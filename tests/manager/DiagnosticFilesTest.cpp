@@ -10,36 +10,13 @@
 #include <string>
 
 #include "Calls.h"
+#include "DiagnosticPlace.h"
 #include "Files.h"
 #include "Installation.h"
 
 using namespace support;
 
 namespace {
-
-constexpr const char* kOpenedFiles[] = {"/tmp/attr.txt", "/tmp/orvattr.txt", "/tmp/objectclass.txt",
-                                        "/tmp/lexan.txt"};
-constexpr char kTableFile[] = "/tmp/table.txt";
-
-// Clears the place of a diagnostic file for something else, and again when it goes.
-class Place {
- public:
-  explicit Place(const std::string& path) : m_path(path) { clear(); }
-  ~Place() { clear(); }
-  Place(const Place&) = delete;
-  Place& operator=(const Place&) = delete;
-
-  const char* path() const { return m_path.c_str(); }
-
- private:
-  void clear() {
-    std::error_code error;
-    std::filesystem::remove(m_path, error);
-    EXPECT_FALSE(std::filesystem::exists(std::filesystem::symlink_status(m_path))) << m_path;
-  }
-
-  std::string m_path;
-};
 
 std::string goodText() { return attributeType("1.1", "a"); }
 
@@ -88,13 +65,14 @@ TEST(DiagnosticFiles, SymbolicLinkIsNotFollowed) {
   const std::string target = directory.write("target", "precious\n");
   for (const char* path : kOpenedFiles) {
     SCOPED_TRACE(path);
-    const Place place(path);
+    const DiagnosticPlace place(path);
     ASSERT_EQ(::symlink(target.c_str(), place.path()), 0);
+    giveToAnotherUser(place.path());
     expectReadingGoesOn(path);
     EXPECT_EQ(readWholeFile(target), "precious\n");
     EXPECT_TRUE(std::filesystem::is_symlink(path));
   }
-  const Place place(kTableFile);
+  const DiagnosticPlace place(kTableFile);
   ASSERT_EQ(::symlink(target.c_str(), place.path()), 0);
   expectTableIsPassedOver();
   EXPECT_EQ(readWholeFile(target), "precious\n");
@@ -106,12 +84,12 @@ TEST(DiagnosticFiles, SymbolicLinkToNothingMakesNoFile) {
   const std::string target = directory.file("target");
   for (const char* path : kOpenedFiles) {
     SCOPED_TRACE(path);
-    const Place place(path);
+    const DiagnosticPlace place(path);
     ASSERT_EQ(::symlink(target.c_str(), place.path()), 0);
     expectReadingGoesOn(path);
     EXPECT_FALSE(fileExists(target));
   }
-  const Place place(kTableFile);
+  const DiagnosticPlace place(kTableFile);
   ASSERT_EQ(::symlink(target.c_str(), place.path()), 0);
   expectTableIsPassedOver();
   EXPECT_FALSE(fileExists(target));
@@ -122,12 +100,12 @@ TEST(DiagnosticFiles, SecondNameOfAnotherFileIsNotEmptied) {
   const std::string target = directory.write("target", "precious\n");
   for (const char* path : kOpenedFiles) {
     SCOPED_TRACE(path);
-    const Place place(path);
+    const DiagnosticPlace place(path);
     ASSERT_EQ(::link(target.c_str(), place.path()), 0);
     expectReadingGoesOn(path);
     EXPECT_EQ(readWholeFile(target), "precious\n");
   }
-  const Place place(kTableFile);
+  const DiagnosticPlace place(kTableFile);
   ASSERT_EQ(::link(target.c_str(), place.path()), 0);
   expectTableIsPassedOver();
   EXPECT_EQ(readWholeFile(target), "precious\n");
@@ -136,12 +114,12 @@ TEST(DiagnosticFiles, SecondNameOfAnotherFileIsNotEmptied) {
 TEST(DiagnosticFiles, FifoWithoutAReaderDoesNotBlock) {
   for (const char* path : kOpenedFiles) {
     SCOPED_TRACE(path);
-    const Place place(path);
+    const DiagnosticPlace place(path);
     ASSERT_EQ(::mkfifo(place.path(), 0600), 0);
     expectReadingGoesOn(path);
     EXPECT_TRUE(std::filesystem::is_fifo(path));
   }
-  const Place place(kTableFile);
+  const DiagnosticPlace place(kTableFile);
   ASSERT_EQ(::mkfifo(place.path(), 0600), 0);
   expectTableIsPassedOver();
 }
@@ -154,14 +132,14 @@ TEST(DiagnosticFiles, FifoWithAReaderIsNotWrittenTo) {
   };
   for (const char* path : kOpenedFiles) {
     SCOPED_TRACE(path);
-    const Place place(path);
+    const DiagnosticPlace place(path);
     ASSERT_EQ(::mkfifo(place.path(), 0600), 0);
     const int reader = ::open(place.path(), O_RDONLY | O_NONBLOCK);
     ASSERT_GE(reader, 0);
     expectReadingGoesOn(path);
     expectNothingIn(reader);
   }
-  const Place place(kTableFile);
+  const DiagnosticPlace place(kTableFile);
   ASSERT_EQ(::mkfifo(place.path(), 0600), 0);
   const int reader = ::open(place.path(), O_RDONLY | O_NONBLOCK);
   ASSERT_GE(reader, 0);
@@ -172,21 +150,21 @@ TEST(DiagnosticFiles, FifoWithAReaderIsNotWrittenTo) {
 TEST(DiagnosticFiles, DirectoryInPlaceIsLeft) {
   for (const char* path : kOpenedFiles) {
     SCOPED_TRACE(path);
-    const Place place(path);
+    const DiagnosticPlace place(path);
     ASSERT_EQ(::mkdir(place.path(), 0700), 0);
     expectReadingGoesOn(path);
     EXPECT_TRUE(std::filesystem::is_directory(path));
   }
-  const Place place(kTableFile);
+  const DiagnosticPlace place(kTableFile);
   ASSERT_EQ(::mkdir(place.path(), 0700), 0);
   expectTableIsPassedOver();
 }
 
 TEST(DiagnosticFiles, AllFourAreTriedInOrder) {
-  const Place attr("/tmp/attr.txt");
-  const Place orvattr("/tmp/orvattr.txt");
-  const Place objectclass("/tmp/objectclass.txt");
-  const Place lexan("/tmp/lexan.txt");
+  const DiagnosticPlace attr("/tmp/attr.txt");
+  const DiagnosticPlace orvattr("/tmp/orvattr.txt");
+  const DiagnosticPlace objectclass("/tmp/objectclass.txt");
+  const DiagnosticPlace lexan("/tmp/lexan.txt");
   for (const char* path : kOpenedFiles) {
     ASSERT_EQ(::mkdir(path, 0700), 0) << path;
   }
@@ -206,11 +184,11 @@ TEST(DiagnosticFiles, AllFourAreTriedInOrder) {
 }
 
 TEST(DiagnosticFiles, AreMadeWhenMissing) {
-  const Place attr("/tmp/attr.txt");
-  const Place orvattr("/tmp/orvattr.txt");
-  const Place objectclass("/tmp/objectclass.txt");
-  const Place lexan("/tmp/lexan.txt");
-  const Place table(kTableFile);
+  const DiagnosticPlace attr("/tmp/attr.txt");
+  const DiagnosticPlace orvattr("/tmp/orvattr.txt");
+  const DiagnosticPlace objectclass("/tmp/objectclass.txt");
+  const DiagnosticPlace lexan("/tmp/lexan.txt");
+  const DiagnosticPlace table(kTableFile);
   Installation installation;
   EXPECT_EQ(installation.read("V3.user.at", goodText()), 0);
   for (const char* path : kOpenedFiles) {

@@ -38,7 +38,16 @@ std::string withoutTimeStamp(const std::string& text) {
   return kHeader + text.substr(text.find('\n') + 1);
 }
 
-// Kind, mode and owner; of a regular file also the time of its last change, and its text.
+void redirect(const std::string& path, int descriptor) {
+  const int file = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0666);
+  if (file < 0 || ::dup2(file, descriptor) < 0) {
+    ::_exit(126);
+  }
+  ::close(file);
+}
+
+}  // namespace
+
 std::string described(const std::string& path) {
   struct stat status {};
   EXPECT_EQ(0, ::lstat(path.c_str(), &status)) << path;
@@ -50,16 +59,6 @@ std::string described(const std::string& path) {
   }
   return text.str();
 }
-
-void redirect(const std::string& path, int descriptor) {
-  const int file = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0666);
-  if (file < 0 || ::dup2(file, descriptor) < 0) {
-    ::_exit(126);
-  }
-  ::close(file);
-}
-
-}  // namespace
 
 // The capabilities that let root pass over permissions are not got back by starting a program.
 void obeyPermissions() {

@@ -58,8 +58,7 @@ class ToolFolder {
   // The names in the folder itself, blank-separated, those of captured output left out.
   std::string names() const;
 
-  // Everything in the folder, that of captured output left out: for every entry its path, kind,
-  // mode and owner; for a regular file the time of its last change and its text too.
+  // Everything in the folder as described() tells, that of captured output left out.
   std::string snapshot() const;
 
   std::string withoutPath(std::string text) const;
@@ -72,6 +71,10 @@ class ToolFolder {
   std::string m_program = SCHEMA_MIGRATE;
   support::TemporaryDirectory m_folder;
 };
+
+// Kind, mode and owner of an entry, on a line; of a regular file also the time of its last change,
+// and its text.
+std::string described(const std::string& path);
 
 // To be called in `prepare`: lets permissions hold for the program that is started, if it is
 // root's.

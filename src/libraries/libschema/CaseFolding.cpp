@@ -28,19 +28,19 @@ std::string lowered(std::string text) {
   return text;
 }
 
-bool isLoweredFormOf(const std::string& folded, const std::string& text) {
-  return folded.size() == text.size() &&
-         std::equal(folded.begin(), folded.end(), text.begin(),
-                    [](char f, char t) { return lower(f) == f && (f == t || lower(t) == f); });
+LowerCase::LowerCase() : m_forms() {
+  for (std::size_t c = 0; c < m_forms.size(); ++c) {
+    m_forms[c] = lower(static_cast<char>(c));
+  }
 }
 
 bool hasPartners(const std::vector<std::string>& mine, const std::vector<std::string>& theirs) {
+  // Equal lists have the partners at the same places.
+  if (mine == theirs) {
+    return true;
+  }
   constexpr std::size_t kShort = 12;
   if (theirs.size() <= kShort) {
-    // Equal lists have the partners at the same places.
-    if (mine == theirs) {
-      return true;
-    }
     return std::all_of(mine.begin(), mine.end(), [&](const std::string& member) {
       return std::any_of(theirs.begin(), theirs.end(),
                          [&](const std::string& other) { return equalLowered(member, other); });

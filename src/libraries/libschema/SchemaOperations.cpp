@@ -1,6 +1,7 @@
 // The operations between two managers: comparison, merge, collision check, and the reports of the
 // last.
 
+#include <algorithm>
 #include <iterator>
 #include <string>
 #include <string_view>
@@ -25,6 +26,24 @@ struct SchemaManager::Operations {
   template <typename Definition>
   using Iterator = typename Table<Definition>::iterator;
 
+  // Whether the key of an entry is what its definition gives for one: the first name in lower case,
+  // or the OID, in which the key itself lies.
+  class NameKeyTest {
+   public:
+    bool operator()(const std::string& key, const ORVSchema& definition) const {
+      const std::vector<std::string>& names = definition.namesInPlace();
+      return names.empty() ? key.empty() : m_lowerCase.isFormOf(key, names.front());
+    }
+
+   private:
+    libschema::LowerCase m_lowerCase;
+  };
+  struct OidKeyTest {
+    bool operator()(std::string_view /*key*/, const ORVSchema& /*definition*/) const {
+      return true;
+    }
+  };
+
   // A definition met on a walk over a table: what the kind's look-up finds under the key of the
   // entry, and the key that this definition gives, which is the entry's own unless the locale has
   // changed.
@@ -35,31 +54,44 @@ struct SchemaManager::Operations {
     bool isOwnKey;
   };
 
-  // `buffer` is the place for a key that differs from the entry's.
   template <typename Definition>
-  static Met<Definition> meet(const SchemaManager& manager,
-                              const typename Table<Definition>::value_type& entry,
-                              std::string* buffer) {
-    using Rules = Kind<Definition>;
-    if (Rules::isKeyOf(entry.first, *entry.second)) {
-      typename Rules::LookUp trace;
-      return {*entry.second, Rules::keyAt(entry), true};
+  class Walk {
+   public:
+    using Entry = typename Table<Definition>::value_type;
+
+    Walk(const SchemaManager& manager, Table<Definition>* references)
+        : m_manager(manager), m_references(*references), m_inReference(*references) {}
+
+    Met<Definition> meet(const Entry& entry) {
+      using Rules = Kind<Definition>;
+      if (m_isKeyOf(entry.first, *entry.second)) {
+        typename Rules::LookUp trace;
+        return {*entry.second, Rules::keyAt(entry), true};
+      }
+      const Definition& definition = orNew(Rules::lookUp(m_manager, std::string(entry.first)));
+      m_key = Rules::keyOf(definition);
+      return {definition, m_key, false};
     }
-    const Definition& definition = orNew(Rules::lookUp(manager, std::string(entry.first)));
-    *buffer = Rules::keyOf(definition);
-    return {definition, *buffer, false};
-  }
+
+    // What the reference has under the key of a definition met; null when it has nothing.
+    const Definition* findInReference(const Met<Definition>& met) {
+      const auto found = met.isOwnKey ? m_inReference.find(met.key) : m_references.find(met.key);
+      return found == m_references.end() ? nullptr : found->second;
+    }
+
+   private:
+    const SchemaManager& m_manager;
+    Table<Definition>& m_references;
+    AscendingLookup<Table<Definition>> m_inReference;
+    typename Kind<Definition>::KeyTest m_isKeyOf;
+    std::string m_key;  // one that differs from its entry's
+  };
 
   // A look-up whose answer is known already.
   template <typename Definition>
   static const Definition* answerOf(const Definition* definition) {
     typename Kind<Definition>::LookUp trace;
     return definition;
-  }
-
-  static bool isFirstNameLower(const std::string& key, const ORVSchema& definition) {
-    const std::vector<std::string>& names = definition.namesInPlace();
-    return names.empty() ? key.empty() : libschema::isLoweredFormOf(key, names.front());
   }
 
   // An absent definition reads as a newly constructed one.
@@ -100,6 +132,43 @@ struct SchemaManager::Operations {
     std::vector<std::string> m_keys;
   };
 
+  // OIDs to take out of the file sets. Each is taken out at once while anything is traced, since a
+  // removal has records of its own; else all at the end of a walk, in the order of the sets.
+  class Removals {
+   public:
+    explicit Removals(SchemaManager* manager) : m_manager(*manager) {}
+
+    void add(const std::string& oid) {
+      if (tracepoint::isAnythingTraced()) {
+        m_manager.dropFromFileSets(oid);
+      } else {
+        m_oids.push_back(&oid);
+      }
+    }
+
+    // An OID that came more than once is taken out of as many sets, the first ones that hold it.
+    void apply() {
+      std::sort(m_oids.begin(), m_oids.end(),
+                [](const std::string* left, const std::string* right) { return *left < *right; });
+      for (OidSet SchemaManager::*const fileSet : kFileSets) {
+        OidSet& set = m_manager.*fileSet;
+        AscendingLookup<OidSet> place(set);
+        const auto isTaken = [&](const std::string* oid) {
+          const bool isHeld = place.find(*oid) != set.end();
+          if (isHeld) {
+            place.erase();
+          }
+          return isHeld;
+        };
+        m_oids.erase(std::remove_if(m_oids.begin(), m_oids.end(), isTaken), m_oids.end());
+      }
+    }
+
+   private:
+    SchemaManager& m_manager;
+    std::vector<const std::string*> m_oids;
+  };
+
   // Puts `moved`, whose OID is the key of the entry, in the place of the entry's definition. The
   // key lies in the definition, so it changes with it.
   template <typename Definition>
@@ -133,6 +202,7 @@ template <>
 struct SchemaManager::Operations::Kind<Attribute> {
   using Table = NameTable<Attribute>;
   using LookUp = tracepoint::GetAttr;
+  using KeyTest = NameKeyTest;
   static constexpr bool kHasFileSet = true;
   static constexpr bool kPrunesOidTable = true;
   static constexpr Table SchemaManager::*kTable = &SchemaManager::attrTable;
@@ -141,9 +211,6 @@ struct SchemaManager::Operations::Kind<Attribute> {
     return manager.lookUpAttr(key);
   }
   static std::string keyOf(const Attribute& definition) { return definition.getFirstNameLower(); }
-  static bool isKeyOf(const std::string& key, const Attribute& definition) {
-    return isFirstNameLower(key, definition);
-  }
   static const std::string& keyAt(const Table::value_type& entry) { return entry.first; }
   static bool areEqual(const Attribute& mine, const Attribute& theirs) {
     return mine.attrsEqual(theirs) != 0;
@@ -154,6 +221,7 @@ template <>
 struct SchemaManager::Operations::Kind<ObjectClass> {
   using Table = NameTable<ObjectClass>;
   using LookUp = tracepoint::GetObjClass;
+  using KeyTest = NameKeyTest;
   static constexpr bool kHasFileSet = true;
   static constexpr bool kPrunesOidTable = false;
   static constexpr Table SchemaManager::*kTable = &SchemaManager::ocTable;
@@ -162,9 +230,6 @@ struct SchemaManager::Operations::Kind<ObjectClass> {
     return manager.lookUpObjClass(key);
   }
   static std::string keyOf(const ObjectClass& definition) { return definition.getFirstNameLower(); }
-  static bool isKeyOf(const std::string& key, const ObjectClass& definition) {
-    return isFirstNameLower(key, definition);
-  }
   static const std::string& keyAt(const Table::value_type& entry) { return entry.first; }
   static bool areEqual(const ObjectClass& mine, const ObjectClass& theirs) {
     return mine.objsEqual(theirs);
@@ -176,6 +241,7 @@ template <>
 struct SchemaManager::Operations::Kind<ORVAttribute> {
   using Table = OidTable<ORVAttribute>;
   using LookUp = tracepoint::GetORVAttr;
+  using KeyTest = OidKeyTest;
   static constexpr bool kHasFileSet = false;
   static constexpr bool kPrunesOidTable = false;
   static constexpr Table SchemaManager::*kTable = &SchemaManager::orvAttrTable;
@@ -185,7 +251,6 @@ struct SchemaManager::Operations::Kind<ORVAttribute> {
   static const std::string& keyOf(const ORVAttribute& definition) {
     return definition.oidInPlace();
   }
-  static bool isKeyOf(std::string_view /*key*/, const ORVAttribute& /*definition*/) { return true; }
   static const std::string& keyAt(const Table::value_type& entry) {
     return entry.second->oidInPlace();
   }
@@ -202,28 +267,28 @@ template <typename Definition>
 void SchemaManager::Operations::compare(SchemaManager* self, SchemaManager* reference) {
   using Rules = Kind<Definition>;
   Table<Definition>& table = self->*Rules::kTable;
-  Table<Definition>& references = reference->*Rules::kTable;
-  AscendingLookup<Table<Definition>> inReference(references);
+  Walk<Definition> walk(*self, &(reference->*Rules::kTable));
   Erasures<Definition> dropped;
-  std::string buffer;
+  Removals removals(self);
   for (auto entry = table.begin(); entry != table.end(); ++entry) {
-    const auto& [mine, key, isOwnKey] = meet<Definition>(*self, *entry, &buffer);
-    const auto found = inReference.find(key);
-    const Definition* theirs = nullptr;
-    if (found != references.end()) {
-      theirs = isOwnKey ? answerOf<Definition>(found->second)
-                        : &orNew(Rules::lookUp(*reference, std::string(entry->first)));
+    const Met<Definition> met = walk.meet(*entry);
+    const Definition* theirs = walk.findInReference(met);
+    if (theirs != nullptr) {
+      theirs = met.isOwnKey ? answerOf<Definition>(theirs)
+                            : &orNew(Rules::lookUp(*reference, std::string(entry->first)));
     }
+    const Definition& mine = met.definition;
     const std::string& oid = mine.oidInPlace();
     if (!self->excludes(oid) && (theirs == nullptr || !Rules::areEqual(mine, *theirs))) {
       continue;
     }
-    dropped.add(entry, key);
+    dropped.add(entry, met.key);
     if (Rules::kHasFileSet) {
-      self->dropFromFileSets(oid);
+      removals.add(oid);
     }
   }
   dropped.apply(&table);
+  removals.apply();
 }
 
 bool SchemaManager::compSchemas(SchemaManager* reference) {
@@ -306,9 +371,10 @@ template <typename Definition>
 void SchemaManager::Operations::eraseMoved(SchemaManager* source) {
   using Rules = Kind<Definition>;
   Table<Definition>& table = source->*Rules::kTable;
+  typename Rules::KeyTest isKeyOf;
   Erasures<Definition> moved;
   for (auto entry = table.begin(); entry != table.end(); ++entry) {
-    if (Rules::isKeyOf(entry->first, *entry->second)) {
+    if (isKeyOf(entry->first, *entry->second)) {
       moved.add(entry, Rules::keyAt(*entry));
     } else {
       moved.add(entry, Rules::keyOf(*entry->second));
@@ -401,17 +467,14 @@ template <typename Definition>
 void SchemaManager::Operations::check(SchemaManager* self, SchemaManager* reference) {
   using Rules = Kind<Definition>;
   Table<Definition>& table = self->*Rules::kTable;
-  Table<Definition>& references = reference->*Rules::kTable;
-  AscendingLookup<Table<Definition>> inReference(references);
+  Walk<Definition> walk(*self, &(reference->*Rules::kTable));
   Erasures<Definition> dropped;
   std::vector<const std::string*> collidingOids;
-  std::string buffer;
   for (auto entry = table.begin(); entry != table.end(); ++entry) {
-    const auto& [mine, key, isOwnKey] = meet<Definition>(*self, *entry, &buffer);
-    static_cast<void>(isOwnKey);
-    const std::string& oid = mine.oidInPlace();
-    if (inReference.find(key) == references.end() && !isKey(*reference, oid)) {
-      dropped.add(entry, key);
+    const Met<Definition> met = walk.meet(*entry);
+    const std::string& oid = met.definition.oidInPlace();
+    if (walk.findInReference(met) == nullptr && !isKey(*reference, oid)) {
+      dropped.add(entry, met.key);
     } else if (Rules::kPrunesOidTable) {
       collidingOids.push_back(&oid);
     }

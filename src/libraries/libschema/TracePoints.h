@@ -19,6 +19,9 @@ constexpr std::uint64_t kDebugEvents = 0x04000000;
 constexpr unsigned long kDebugLevel = 0x3400000;
 constexpr unsigned long kDebugCallLevel = 0xc8010000;
 
+// While nothing is traced, no record tells in which order things are done.
+inline bool isAnythingTraced() { return trcEvents != 0; }
+
 // The classes of the library, as numbered in the identifiers.
 enum Class : unsigned long {
   kAttribute = 0x01,
