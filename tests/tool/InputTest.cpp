@@ -209,24 +209,6 @@ TEST(InputEmpty, GivesEmptyFiles) {
   EXPECT_EQ(nothing, folder.contents("new"));
 }
 
-TEST(InputBytes, OddOnesBetweenDefinitionsAreNoError) {
-  using std::string_literals::operator""s;
-  const std::string definition = "attributetypes=( 1.1 NAME 'a' OBSOLETE )";
-  const std::string written =
-      kHeader + "attributetypes=( 1.1 NAME ( 'a'  ) OBSOLETE USAGE userApplications  )\n"s;
-  for (const std::string& text :
-       {"\xEF\xBB\xBF" + definition + "\n", "\r\n" + definition + "\r\n", "\0\0"s + definition,
-        "\xFF\xFE" + definition + "\x80", "# \xC3\xA4\n" + definition}) {
-    const ToolFolder folder;
-    folder.install("old", {{"V3.user.at", text}});
-    folder.install("new", {{"V3.user.at", ""}});
-    const ToolResult result = folder.migrate();
-    EXPECT_EQ(0, result.exitCode);
-    EXPECT_EQ("", result.err);
-    EXPECT_EQ(written, folder.contents("out")["V3.user.at"]) << text;
-  }
-}
-
 // A definition of every kind with every clause, cut off behind every byte: the run is made, or
 // refused with a place in this file; it never hangs, never leaves anything behind, and the inputs
 // are what they were.

@@ -179,6 +179,20 @@ TEST_F(Output, ReportThatCannotBePrintedStopsTheRun) {
   EXPECT_EQ("new old", folder.names());
 }
 
+// The summary comes when the output is in place.
+TEST_F(Output, SummaryThatCannotBePrintedIsTold) {
+  const ToolResult result = folder.migrate({}, [] {
+    const rlimit limit{400, 400};
+    ::setrlimit(RLIMIT_FSIZE, &limit);
+  });
+  EXPECT_EQ(5, result.exitCode);
+  EXPECT_EQ(
+      "@/out: error: is complete and in place, but the summary cannot be written to standard output\n",
+      result.err);
+  EXPECT_EQ(8U, folder.contents("out").size());
+  EXPECT_EQ("new old out", folder.names());
+}
+
 // With standard output closed, a file of the output would be opened in its place.
 TEST_F(Output, IsNotMixedUpWithAClosedStandardOutput) {
   folder.migrate({}, [] {

@@ -51,7 +51,7 @@ Exit codes:
   2  the command line is wrong
   3  an input is missing, unreadable or cannot be parsed
   4  refused: a definition cannot be migrated; nothing was written
-  5  writing or verification failed; DIR is not in place
+  5  writing or verification failed; DIR is not in place, unless the message says it is
 
 Manual: man schema-migrate)";
 

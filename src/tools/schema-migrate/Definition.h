@@ -29,6 +29,10 @@ struct Definition {
   std::unique_ptr<ORVSchema> object;  // null once it is not needed any more
 };
 
+// What a line may have beside its longest text. A buffer with room for both does not grow: one that
+// has to would for a while be there twice.
+constexpr std::size_t kRestOfLine = 4096;
+
 // The digest of the line that the library writes for `object`, without the line end. `line` is a
 // buffer for it.
 Digest digestOfLine(DefinitionKind kind, ORVSchema* object, std::string* line);

@@ -44,6 +44,9 @@ constexpr bool belongsToList(int token) {
          token == KEY_ATTRIBUTETYPES;
 }
 
+// A single byte that belongs to no word, but is neither a bracket nor any other printing character.
+constexpr bool isStrayByte(int token) { return token < ' ' || token == '\x7f'; }
+
 class Forecaster {
  public:
   Forecaster(TokenReader tokens, ForecastObserver* observer)
@@ -74,6 +77,8 @@ class Forecaster {
   Outcome notClosed(const std::string& what);
   Outcome neverEnds(const Position& position, const std::string& problem);
   void report(const Position& position, const std::string& problem);
+  void reportBrokenString();
+  void reportStrayByte(int token);
   std::string definition() const;
 
   TokenReader m_tokens;
@@ -94,6 +99,7 @@ Forecast Forecaster::run() {
   while (token != TOKEN_END) {
     if (!startsDefinition(token)) {
       token = m_tokens.lexan();
+      reportBrokenString();
     } else if (readAfterKeyword(token, &token) != Outcome::kRead) {
       break;
     }
@@ -136,9 +142,11 @@ Outcome Forecaster::readDefinition(DefinitionKind kind, const Position* keyword,
   const Outcome outcome = kind == DefinitionKind::kAttributeType ? attributeType()
                           : kind == DefinitionKind::kObjectClass ? objectClass()
                                                                  : vendorExtension();
+  reportBrokenString();
   if (outcome == Outcome::kRead && m_observer != nullptr) {
     m_observer->definition(kind, m_begin);
   }
+  m_isOdd = false;
   return outcome;
 }
 
@@ -252,6 +260,7 @@ Outcome Forecaster::objectClassClause(int* token) {
         m_tokens.match('(');
         *token = list();
       } else {
+        reportStrayByte(*token);
         *token = next();
       }
       return Outcome::kRead;
@@ -292,6 +301,7 @@ int Forecaster::list() {
     token = m_tokens.lexan();
   }
   if (token != ')') {
+    reportStrayByte(token);
     m_previous = token;
     return token;
   }
@@ -388,7 +398,7 @@ int Forecaster::next() {
 
 // The token behind a keyword's value, whatever the value is.
 int Forecaster::afterValue() {
-  next();
+  reportStrayByte(next());
   return next();
 }
 
@@ -419,12 +429,36 @@ Outcome Forecaster::neverEnds(const Position& position, const std::string& probl
   return Outcome::kNeverEnds;
 }
 
-// Once for each definition: what follows is mostly a consequence.
+// Once for each definition, and for the text between two: what follows is mostly a consequence, and
+// everything may be one of a string that was cut off.
 void Forecaster::report(const Position& position, const std::string& problem) {
+  reportBrokenString();
   if (m_observer != nullptr && !m_isOdd) {
     m_observer->oddity(position, problem);
   }
   m_isOdd = true;
+}
+
+void Forecaster::reportBrokenString() {
+  Position begin;
+  std::string end;
+  if (m_tokens.takeBrokenString(&begin, &end)) {
+    report(
+        begin,
+        "the text in quotes that begins here is cut off by " + end +
+            ", since only printable ASCII characters and TABs belong to it; what stands behind is read as if it were outside, and definitions may get lost; write the text and its closing quote on one line, without other bytes");
+  }
+}
+
+// `token` stands where a value, or another member of a list, is expected.
+void Forecaster::reportStrayByte(int token) {
+  if (isStrayByte(token)) {
+    report(
+        m_tokens.position(),
+        "the byte " + printable({static_cast<char>(token)}) +
+            " takes the place of a value, or of the rest of a list, in " + definition() +
+            "; what stands behind gets lost or is taken for something else; take the byte away, or write the value on the line of its keyword");
+  }
 }
 
 std::string Forecaster::definition() const {

@@ -63,7 +63,8 @@ Inventory::Inventory(std::string role, std::string directory, std::string* warni
     }
   }
   if (!problems.empty()) {
-    throw Failure(kBadInput, problems);
+    // What was odd may well be the cause of what is wrong.
+    throw Failure(kBadInput, *warnings + problems);
   }
   makeDigests();
 }
@@ -139,11 +140,8 @@ std::string Inventory::takeDefinitions(std::size_t file, const std::vector<std::
 }
 
 void Inventory::makeDigests() {
-  // Room for a long text and what is short: a line that had to grow would for a while be there
-  // twice.
-  constexpr std::size_t kRest = 4096;
   std::string line;
-  line.reserve(m_longestText + kRest);
+  line.reserve(m_longestText + kRestOfLine);
   for (Definition& definition : m_definitions) {
     definition.lineDigest = digestOfLine(definition.kind, definition.object.get(), &line);
   }

@@ -189,23 +189,54 @@ int TokenReader::readNumber(char c) {
 }
 
 int TokenReader::readWord(char c) {
-  const bool isQuoted = c == '\'';
-  m_text.clear();
-  if (isQuoted && !read(&c)) {
-    return TOKEN_END;
+  if (c == '\'') {
+    return readQuoted(c);
   }
-  while (isQuoted ? belongsToQuoted(c) : belongsToWord(c)) {
+  m_text.clear();
+  while (belongsToWord(c)) {
     m_text += c;
     if (!read(&c)) {
       return TOKEN_END;
     }
   }
-  // What ended a quoted string is dropped, whatever it was.
-  if (isQuoted && !read(&c)) {
+  putBack();
+  return lookUp(TOKEN_NAME);
+}
+
+// What ended a quoted string is dropped, whatever it was.
+int TokenReader::readQuoted(char c) {
+  m_text.clear();
+  bool isRead = read(&c);
+  while (isRead && belongsToQuoted(c)) {
+    m_text += c;
+    isRead = read(&c);
+  }
+  if (!isRead) {
+    noteBrokenString("the end of the file");
+    return TOKEN_END;
+  }
+  if (c != '\'') {
+    noteBrokenString(c == '\n' ? "the end of the line" : "the byte " + printable({c}));
+  }
+  if (!read(&c)) {
     return TOKEN_END;
   }
   putBack();
   return lookUp(TOKEN_NAME);
+}
+
+void TokenReader::noteBrokenString(const std::string& end) {
+  if (m_brokenBy.empty()) {
+    m_brokenString = m_position;
+    m_brokenBy = end;
+  }
+}
+
+bool TokenReader::takeBrokenString(Position* begin, std::string* end) {
+  *begin = m_brokenString;
+  *end = std::move(m_brokenBy);
+  m_brokenBy.clear();
+  return !end->empty();
 }
 
 // Quotes make no difference: a keyword in quotes is that keyword. A text that was stored last is

@@ -33,6 +33,10 @@ class TokenReader {
   // Where the token last read begins.
   const Position& position() const { return m_position; }
 
+  // The first quoted string since the last call that something else than a quote ended: where it
+  // begins, and what ended it. Returns false when there is none.
+  bool takeBrokenString(Position* begin, std::string* end);
+
   // The line as the library counts it. A newline that ends a quoted string does not count.
   std::uint64_t countedLine() const { return m_countedLine; }
 
@@ -50,6 +54,8 @@ class TokenReader {
   int readToken(char c);
   int readNumber(char c);
   int readWord(char c);
+  int readQuoted(char c);
+  void noteBrokenString(const std::string& end);
   int lookUp(int token);
 
   InputFile* m_file = nullptr;
@@ -65,6 +71,8 @@ class TokenReader {
   std::uint64_t m_previousLineStart = 0;
 
   Position m_position;
+  Position m_brokenString;
+  std::string m_brokenBy;  // empty when there is none
   std::uint64_t m_countedLine = 1;
   int m_current = -1;
 

@@ -128,7 +128,7 @@ class ReadBack {
     std::string line;
     for (std::size_t i = 0; i < expected.size(); ++i) {
       const Digest& wanted = expected[i]->lineDigest;
-      line.reserve(wanted.length() + 2);
+      line.reserve(wanted.length() + kRestOfLine);
       if (i >= m_objects.size() ||
           digestOfLine(m_objects[i].first, m_objects[i].second.get(), &line) != wanted) {
         return expected[i];

@@ -23,10 +23,9 @@
 
 namespace {
 
-void print(const std::string& text) {
-  if (std::fwrite(text.data(), 1, text.size(), stdout) != text.size() || std::fflush(stdout) != 0) {
-    throw Failure(kNotWritten, errorLine("the report cannot be written to standard output"));
-  }
+bool print(const std::string& text) {
+  return std::fwrite(text.data(), 1, text.size(), stdout) == text.size() &&
+         std::fflush(stdout) == 0;
 }
 
 // With one of the three closed, the next file to be opened would take its place, and get the
@@ -83,7 +82,9 @@ void migrate(const Arguments& arguments) {
   std::cerr << plan.warnings() << std::flush;
 
   const Installations installations{oldOne, newOne, arguments.excludeLists, arguments.withdrawList};
-  print(textFromSeparateProcess([&] { return reportCollisions(installations); }));
+  if (!print(textFromSeparateProcess([&] { return reportCollisions(installations); }))) {
+    throw Failure(kNotWritten, errorLine("the report cannot be written to standard output"));
+  }
   {
     Migration migration(installations);
     migration.write(output.create());
@@ -97,8 +98,13 @@ void migrate(const Arguments& arguments) {
   verifyOutput(output.partialPath(), plan, newOne);
   const std::string summary = summaryOf(oldOne, newOne, &plan);
   output.publish();
-  // Whatever happens to the report now, the directory is there.
-  print("\n" + summary + "Written and verified: " + arguments.out + "\n");
+  if (!print("\n" + summary + "Written and verified: " + arguments.out + "\n")) {
+    throw Failure(
+        kNotWritten,
+        errorLine(
+            arguments.out,
+            "is complete and in place, but the summary cannot be written to standard output"));
+  }
 }
 
 }  // namespace
