@@ -2,9 +2,9 @@
 
 #include <gtest/gtest.h>
 
-#include <unistd.h>
-
+#include <cstdio>
 #include <cstdlib>
+#include <filesystem>
 
 #include "ToolRun.h"
 
@@ -150,6 +150,7 @@ TEST(Migration, OfItsOwnResultChangesNothing) {
 TEST(Migration, IsTheSameInEveryEnvironment) {
   const ToolFolder folder;
   installWhole(folder);
+  const std::string before = folder.snapshot();
   const std::pair<const char*, const char*> kSettings[] = {
       {"LC_ALL", "C"},
       {"LC_ALL", "C.UTF-8"},
@@ -167,10 +168,32 @@ TEST(Migration, IsTheSameInEveryEnvironment) {
     EXPECT_EQ(0, result.exitCode);
     EXPECT_EQ(kPrinted, result.out);
     EXPECT_EQ(kOut, folder.contents("out"));
-    for (const auto& file : kOut) {
-      ::unlink((folder.file("out") + "/" + file.first).c_str());
-    }
+    std::filesystem::remove_all(folder.file("out"));
+    EXPECT_EQ(before, folder.snapshot());
   }
+}
+
+// Linked into a host with a trace facility of its own, all of whose bits are on.
+TEST(Migration, IsTheSameInAHostThatTracesEverything) {
+  ToolFolder folder;
+  folder.useProgram(TRACING_SCHEMA_MIGRATE);
+  installWhole(folder);
+  const ToolResult result =
+      folder.migrate(kLists, [&] { ::setenv("HOST_RECORDS", folder.file("records").c_str(), 1); });
+  EXPECT_EQ(0, result.exitCode);
+  EXPECT_EQ("", result.err);
+  EXPECT_EQ(kPrinted, result.out);
+  EXPECT_EQ(kOut, folder.contents("out"));
+  int entries = 0;
+  int exits = 0;
+  int messages = 0;
+  const std::string records = support::readWholeFile(folder.file("records"));
+  ASSERT_EQ(3, std::sscanf(records.c_str(), "entries %d exits %d messages %d", &entries, &exits,
+                           &messages))
+      << records;
+  EXPECT_GT(entries, 100);
+  EXPECT_EQ(entries, exits);
+  EXPECT_GT(messages, 10);
 }
 
 // ---- Warnings ----
