@@ -296,6 +296,27 @@ TEST(CompSchemas, OidLeavesTheFirstSetThatHoldsItOnly) {
   EXPECT_EQ(takeFromModifiedSchema(installation.manager(), {"1.1"}), "1.1");
 }
 
+// Each of them takes the OID out of the first set that still holds it, traced or not.
+TEST(CompSchemas, DefinitionsOfOneOidLeaveAsManySets) {
+  const UnfreedDefinitions unfreed;
+  const auto pruned = [](bool isTraced) {
+    Installation installation{
+        {"V3.system.at", attributeType("1.1", "a") + attributeType("1.0", "c")},
+        {"V3.orv.at", attributeType("1.1", "a")},
+        {"V3.user.at", attributeType("1.1", "b") + attributeType("1.2", "d")}};
+    Installation reference{{"V3.system.at", attributeType("1.1", "a") + attributeType("1.1", "b") +
+                                                attributeType("1.2", "d")}};
+    if (isTraced) {
+      callsOf([&] { compare(&installation, &reference); });
+    } else {
+      compare(&installation, &reference);
+    }
+    return stateOf(installation.manager());
+  };
+  EXPECT_EQ(pruned(false), "attributes: c=1.0(text)\nV3.system.at: 1.0 1.1\n");
+  EXPECT_EQ(pruned(true), pruned(false));
+}
+
 TEST(CompSchemas, DefinitionOfAConfigFileHasNoSetToLeave) {
   const UnfreedDefinitions unfreed;
   Installation installation{{"V3.config.at", attributeType("1.1", "a")},
