@@ -3,8 +3,9 @@
 namespace support {
 
 LexedText::LexedText(const std::string& text) {
-  m_directory.write("V3.user.at", text);
-  m_lexer = std::make_unique<SchemaLexan>(m_directory.path(), "V3.user.at");
+  const TemporaryDirectory directory;
+  directory.write("V3.user.at", text);
+  m_lexer = std::make_unique<SchemaLexan>(directory.path(), "V3.user.at");
 }
 
 std::string currentText(SchemaLexan* lexer) {

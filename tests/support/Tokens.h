@@ -11,7 +11,8 @@
 
 namespace support {
 
-// A schema file with the given bytes and an analyser over it.
+// An analyser over a schema file with the given bytes. The file has no name any more, so that a
+// process that ends without destructors leaves nothing behind.
 class LexedText {
  public:
   explicit LexedText(const std::string& text);
@@ -23,7 +24,6 @@ class LexedText {
   std::string rest();
 
  private:
-  TemporaryDirectory m_directory;
   std::unique_ptr<SchemaLexan> m_lexer;
 };
 
