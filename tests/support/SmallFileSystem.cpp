@@ -42,7 +42,7 @@ bool mountOver(const std::string& directory, const std::string& options) {
 bool tryToMount() {
   const TemporaryDirectory directory;
   return leaveMountsOfOthers() &&
-         ::mount(nullptr, "/", nullptr, MS_REC | MS_PRIVATE, nullptr) == 0 &&
+         ::mount("none", "/", "none", MS_REC | MS_PRIVATE, nullptr) == 0 &&
          mountOver(directory.path(), "size=4k") && ::umount(directory.path().c_str()) == 0;
 }
 
