@@ -35,17 +35,24 @@ class StandIn : public testing::TestWithParam<const char*> {
   Output run(const std::string& host, const std::string& environment, const std::string& text = "",
              bool isWriting = false) {
     m_directory.write("V3.user.at", text);
+    const std::string err = m_directory.file("stderr");
+    const std::string out = runWithErrorsTo(err, host, environment, isWriting);
+    return {withoutDirectory(out, m_directory.path()),
+            withoutDirectory(readWholeFile(err), m_directory.path())};
+  }
+
+  // The same over the file as it is. Returns what the host wrote to standard output.
+  std::string runWithErrorsTo(const std::string& err, const std::string& host,
+                              const std::string& environment, bool isWriting) {
     ::unsetenv("LIBSCHEMA_TRACE");
     const std::string program = std::string(HOST_FOLDER) + "/trace_host_" + host + "_" + GetParam();
     const std::string out = m_directory.file("stdout");
-    const std::string err = m_directory.file("stderr");
     const std::string command = "env " + environment + " LC_ALL=C " + program + " " +
                                 m_directory.path() + (isWriting ? " " + written() : "") + " >" +
                                 out + " 2>" + err;
     EXPECT_EQ(std::system(("mkdir -p " + written()).c_str()), 0);
-    EXPECT_EQ(std::system(command.c_str()), 0) << command << "\n" << readWholeFile(err);
-    return {withoutDirectory(readWholeFile(out), m_directory.path()),
-            withoutDirectory(readWholeFile(err), m_directory.path())};
+    EXPECT_EQ(std::system(command.c_str()), 0) << command;
+    return readWholeFile(out);
   }
 
   std::string written() const { return m_directory.file("written"); }
@@ -179,6 +186,11 @@ TEST_P(StandIn, WritesLongTextsWhole) {
   const Output output = run("Plain", "LIBSCHEMA_TRACE=0x04000000",
                             "attributetypes=( 1.1 NAME '" + name + "' DESC 'd'\n");
   EXPECT_NE(output.err.find("while parsing the attribute: " + name + "\n"), std::string::npos);
+}
+
+TEST_P(StandIn, DropsRecordsThatCannotBeWritten) {
+  EXPECT_EQ(run("Plain", "LIBSCHEMA_TRACE=0x04003000").out, "read 0\n");
+  EXPECT_EQ(runWithErrorsTo("/dev/full", "Plain", "LIBSCHEMA_TRACE=0x04003000", false), "read 0\n");
 }
 
 // Every digit is read as 9.

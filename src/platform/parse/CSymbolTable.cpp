@@ -12,11 +12,17 @@ CSymbolTable::CSymbolTable() {
 
 CSymbolTable::~CSymbolTable() = default;
 
-CSymbolTable::Entry* CSymbolTable::appendEntry(Kind kind, int token, bool isKeyword) {
+// The slot behind the last entry. It keeps the text that it had.
+CSymbolTable::Entry* CSymbolTable::nextSlot() {
   if (m_used == m_entries.size()) {
     m_entries.emplace_back();
   }
-  Entry* entry = &m_entries[m_used++];
+  return &m_entries[m_used];
+}
+
+CSymbolTable::Entry* CSymbolTable::appendEntry(Kind kind, int token, bool isKeyword) {
+  Entry* entry = nextSlot();
+  ++m_used;
   entry->kind = kind;
   entry->isKeyword = isKeyword;
   entry->token = token;
@@ -29,14 +35,9 @@ int CSymbolTable::insertValue(std::string value, int token, bool isKeyword) {
 }
 
 int CSymbolTable::insertText(std::string_view text, int token, bool isKeyword) {
-  Entry* entry = appendEntry(Kind::kNone, token, isKeyword);
-  try {
-    entry->text.assign(text);
-  } catch (...) {
-    --m_used;
-    throw;
-  }
-  entry->kind = Kind::kString;
+  // The copy comes first: where there is no memory for it, the table stays as it is.
+  nextSlot()->text.assign(text);
+  appendEntry(Kind::kString, token, isKeyword);
   const int index = static_cast<int>(m_used) - 1;
   link(index);
   return index;

@@ -90,6 +90,7 @@ class CSymbolTable {
   static constexpr std::size_t kBuckets = 128;
 
   const Entry* entryAt(int index) const;
+  Entry* nextSlot();
   Entry* appendEntry(Kind kind, int token, bool isKeyword);
   std::string_view textAt(int index) const;
   void link(int index);
