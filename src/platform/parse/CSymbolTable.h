@@ -135,8 +135,8 @@ inline int CSymbolTable::findText(std::string_view text) const {
     }
     index = entry.next;
   }
-  const bool isBorrowed = m_borrower >= 0 && m_borrowed == text;
-  return isBorrowed && (index < 0 || m_borrower < index) ? m_borrower : index;
+  const bool canBeBorrower = m_borrower >= 0 && (index < 0 || m_borrower < index);
+  return canBeBorrower && m_borrowed == text ? m_borrower : index;
 }
 
 inline bool CSymbolTable::hasInputRoomAt(const char* place) const {
