@@ -14,18 +14,25 @@ using libschema::Scanned;
 
 namespace {
 
-// The keyword that a spelling of a definition's start stands for; empty for any other text.
-std::string_view foldStart(std::string_view text) {
-  if (text == "objectClasses") {
-    return "objectclasses";
+// A spelling of a definition's start, and the keyword that it stands for.
+struct Spelling {
+  std::string_view text;
+  std::string_view keyword;
+};
+constexpr Spelling kSpellings[] = {
+    {"objectClasses", "objectclasses"},
+    {"attributeTypes", "attributetypes"},
+    {"ORVattributeTypes", "ORVAttributetypes"},
+};
+
+// The index of the keyword that a text stands for; -1 when it stands for none.
+int findStart(std::string_view text, const CSymbolTable& table) {
+  for (const Spelling& start : kSpellings) {
+    if (text == start.text) {
+      return table.findText(start.keyword);
+    }
   }
-  if (text == "attributeTypes") {
-    return "attributetypes";
-  }
-  if (text == "ORVattributeTypes") {
-    return "ORVAttributetypes";
-  }
-  return {};
+  return -1;
 }
 
 const char* localeName(const char* name) { return name == nullptr ? "" : name; }
@@ -135,8 +142,7 @@ int SchemaLexan::takeCharacter(int token) {
 int SchemaLexan::takeText(std::string_view text, bool isInBuffer, int token) {
   int index = m_symtable->findText(text);
   if (index < 0 && token == TOKEN_NAME) {
-    const std::string_view keyword = foldStart(text);
-    index = keyword.empty() ? -1 : m_symtable->findText(keyword);
+    index = findStart(text, *m_symtable);
   }
   if (index < 0) {
     index = isInBuffer ? m_symtable->replaceBorrowed(m_scratch_index, text, token)
