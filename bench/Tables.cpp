@@ -19,6 +19,11 @@ std::string duration(double seconds) {
                            : formatted("%.0f us", seconds * 1e6);
 }
 
+// Nothing where a work handles no definitions.
+std::string rate(const char* format, double value) {
+  return value == 0 ? "" : formatted(format, value);
+}
+
 std::string ratio(double value) { return value == 0 ? "" : formatted("%.2f", value); }
 
 // "goal 1.3, met"; nothing without a goal.
@@ -54,9 +59,8 @@ std::string ratios(const std::vector<RatioRow>& rows) {
                      rule(2, 7);
   for (const RatioRow& row : rows) {
     text += line({row.work, row.input, duration(row.seconds),
-                  formatted("%.0f", row.definitionsPerSecond),
-                  formatted("%.1f", row.bytesPerSecond / 1e6), ratio(row.toPeer),
-                  verdict(row.toPeer, row.peerGoal), ratio(row.toFloor),
+                  rate("%.0f", row.definitionsPerSecond), rate("%.1f", row.bytesPerSecond / 1e6),
+                  ratio(row.toPeer), verdict(row.toPeer, row.peerGoal), ratio(row.toFloor),
                   verdict(row.toFloor, row.floorGoal)});
   }
   return text;

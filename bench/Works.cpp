@@ -70,7 +70,7 @@ std::string reports(Manager* manager) {
 
 template <typename Manager>
 Run readingRun(const std::vector<FileList>& lists) {
-  return [&lists] {
+  return [lists] {
     std::vector<std::unique_ptr<Manager>> managers;
     return secondsOf([&] {
       for (const FileList& list : lists) {
@@ -179,6 +179,21 @@ Work::Maker fullReading() {
   return [](const Input& input, const std::string&) { return readingRun<Manager>(input.all); };
 }
 
+// Files of the same names with nothing in them: what there is to do for a file whatever its size.
+template <typename Manager>
+Work::Maker emptyReading() {
+  return [](const Input& input, const std::string& output) {
+    std::vector<FileList> lists = input.all;
+    for (FileList& list : lists) {
+      list.directory = output;
+      for (const std::string& name : list.names) {
+        writeText(output + "/" + name, "");
+      }
+    }
+    return readingRun<Manager>(lists);
+  };
+}
+
 template <typename Manager>
 Work::Maker comparison() {
   return [](const Input& input, const std::string&) {
@@ -226,11 +241,24 @@ Work workOf(const char* name, double floorGoal, Work::Maker library, Work::Maker
   return work;
 }
 
+Work readingOfEmptyFiles() {
+  const auto nothing = [](const Input&) { return 0.0; };
+  Work work;
+  work.name = "read as many empty files";
+  work.library = emptyReading<SchemaManager>();
+  work.floor = emptyReading<minimal::Schema>();
+  work.isMeasuredOn = [](const Input& input) { return input.origin == Origin::kExample; };
+  work.definitions = nothing;
+  work.bytes = nothing;
+  return work;
+}
+
 std::vector<Work> makeWorks() {
   std::vector<Work> list;
   list.push_back(readingOfTypesAndClasses());
   list.push_back(
       workOf("read all files", 1.25, fullReading<SchemaManager>(), fullReading<minimal::Schema>()));
+  list.push_back(readingOfEmptyFiles());
   list.push_back(workOf(
       "`lexan()` over all files", 1.5,
       [](const Input& input, const std::string&) { return tokenRun(input, countTokens); },

@@ -21,7 +21,8 @@ struct Work {
   Maker library;
   Maker floor;
   Maker peer;
-  double floorGoal = 0;  // 0: none
+  std::function<bool(const Input&)> isMeasuredOn;  // empty: on every input
+  double floorGoal = 0;                            // 0: none
   std::function<double(const Input&)> peerGoal;
   // What one run handles, for the rates.
   std::function<double(const Input&)> definitions;

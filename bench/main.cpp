@@ -279,6 +279,9 @@ void addAll(const std::vector<Input>& inputs, const Options& options, const std:
             bench::Results* results) {
   for (const Work& work : bench::works()) {
     for (const Input& input : inputs) {
+      if (work.isMeasuredOn && !work.isMeasuredOn(input)) {
+        continue;
+      }
       add(work.name + "/" + input.name, roundsOf(input, options),
           [&, output, results](benchmark::State& state) {
             measureWork(state, work, input, output, results);
@@ -287,7 +290,7 @@ void addAll(const std::vector<Input>& inputs, const Options& options, const std:
   }
   const Work& reading = bench::works()[1];
   for (const Input& input : inputs) {
-    if (input.olderFiles.definitions >= 10000) {
+    if (input.olderFiles.definitions >= 1000) {
       add("peak memory/" + input.name, 3,
           [&, results](benchmark::State& state) { measureMemory(state, reading, input, results); });
     }
