@@ -209,7 +209,7 @@ class SideBySide : public testing::Test {
       std::string types = run == 2   ? "attributetypes=( 1.1\n"
                           : run == 5 ? "attributetypes=( 1.2 NAME 'other' OBSOLETE )\n"
                                      : "attributetypes=( 1.2 NAME 's' DESC 'changed' )\n";
-      for (int i = 0; i < 500 * (run + 1); ++i) {
+      for (int i = 0; i < 150 * (run + 1); ++i) {
         const std::string name = std::to_string(run) + "x" + std::to_string(i);
         types += "attributetypes=( 1." + std::to_string(run) + "." + std::to_string(i) +
                  " NAME 'n" + name + "' DESC '" + name + "' )\n";

@@ -1,6 +1,7 @@
 // schema-migrate: carries the schema of an old installation over to a new release.
 
 #include <fcntl.h>
+#include <malloc.h>
 #include <unistd.h>
 
 #include <csignal>
@@ -38,6 +39,13 @@ void holdStandardStreams() {
   if (descriptor > STDERR_FILENO) {
     ::close(descriptor);
   }
+}
+
+// A long text goes back to the system as soon as it is freed. Unless the limit is given, the
+// allocator raises it to the length of such texts, and keeps them.
+void giveBackLongTexts() {
+  constexpr int kLong = 1 << 22;
+  ::mallopt(M_MMAP_THRESHOLD, kLong);
 }
 
 void complain(std::string* text) {
@@ -111,6 +119,7 @@ void migrate(const Arguments& arguments) {
 
 int main(int argc, char** argv) {
   holdStandardStreams();
+  giveBackLongTexts();
   int exitCode = kDone;
   const std::optional<Arguments> arguments = parseArguments(argc, argv, &exitCode);
   if (!arguments) {
