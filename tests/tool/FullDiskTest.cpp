@@ -97,6 +97,7 @@ TEST_F(FullDisk, FileSystemThatIsTooSmall) {
   }
   EXPECT_EQ("", err);
   EXPECT_GT(pages, 6);
+  RecordProperty("pages", pages);
 }
 
 // A limit on the size of each file cuts it off after any number of bytes. What the program prints
@@ -115,6 +116,7 @@ TEST_F(FullDisk, FileThatIsCutOff) {
   }
   EXPECT_EQ("", err);
   EXPECT_GT(cutOff, 20);
+  RecordProperty("limits", cutOff);
 }
 
 struct Row {

@@ -239,6 +239,8 @@ TEST(InputCutShort, EndsInAResultOrAMessage) {
     }
     ASSERT_EQ(before, folder.snapshot());
   }
+  RecordProperty("lengths", static_cast<int>(text.size()) + 1);
+  RecordProperty("read", read);
   EXPECT_GT(read, 20);
   EXPECT_LT(read, 60);
 }
