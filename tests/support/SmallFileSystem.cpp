@@ -41,8 +41,7 @@ bool mountOver(const std::string& directory, const std::string& options) {
 
 bool tryToMount() {
   const TemporaryDirectory directory;
-  return leaveMountsOfOthers() &&
-         ::mount("none", "/", "none", MS_REC | MS_PRIVATE, nullptr) == 0 &&
+  return leaveMountsOfOthers() && ::mount("none", "/", "none", MS_REC | MS_PRIVATE, nullptr) == 0 &&
          mountOver(directory.path(), "size=4k") && ::umount(directory.path().c_str()) == 0;
 }
 
