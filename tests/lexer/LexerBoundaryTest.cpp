@@ -57,18 +57,26 @@ TEST(Boundary, BlanksBeforeATextChangeNothing) {
   }
 }
 
+// How much lies in the buffer of the stream at a time: the room of the table, less the zero byte
+// behind the data and the byte that the stream keeps. And of a stream that has a buffer of its own.
+constexpr std::size_t kBuffers[] = {CSymbolTable::kInputRoom - 2, 8191};
+
 TEST(Boundary, NewlinesBeforeATextOnlyMoveItsLines) {
-  for (std::size_t padding = 8191 - mixedText().size(); padding <= 8193; padding += 7) {
-    ASSERT_EQ(linesOf(std::string(padding, '\n') + mixedText()),
-              mixedTokens(1 + static_cast<int>(padding)))
-        << padding;
+  for (const std::size_t buffer : kBuffers) {
+    for (std::size_t padding = buffer - mixedText().size(); padding <= buffer + 2; padding += 7) {
+      ASSERT_EQ(linesOf(std::string(padding, '\n') + mixedText()),
+                mixedTokens(1 + static_cast<int>(padding)))
+          << padding;
+    }
   }
 }
 
 TEST(Boundary, CommentBeforeATextOnlyMovesItsLines) {
-  for (std::size_t padding = 8191 - mixedText().size(); padding <= 8193; ++padding) {
-    ASSERT_EQ(linesOf("#" + std::string(padding, '\'') + "\n" + mixedText()), mixedTokens(2))
-        << padding;
+  for (const std::size_t buffer : kBuffers) {
+    for (std::size_t padding = buffer - mixedText().size(); padding <= buffer + 2; ++padding) {
+      ASSERT_EQ(linesOf("#" + std::string(padding, '\'') + "\n" + mixedText()), mixedTokens(2))
+          << padding;
+    }
   }
 }
 
@@ -140,6 +148,22 @@ TEST(Boundary, FileOfExactlyABuffersSizeKeepsItsEndRules) {
     ASSERT_EQ(tokensOf(fill + "DESC 7\n "), "1004 2024:7 260") << size;
     ASSERT_EQ(tokensOf(fill + "  DESC )"), "1004 41 260") << size;
     ASSERT_EQ(tokensOf(fill + "DESC  # "), "1004 260") << size;
+  }
+}
+
+// A text that crosses the end of the buffer takes the place that any other would.
+TEST(Boundary, IndexOfATextDoesNotDependOnThePlace) {
+  const std::string before = "first second";
+  for (const std::size_t padding : {std::size_t{1}, kBuffers[0] - before.size() - 2}) {
+    OpenLexer lexer(before + std::string(padding, ' ') + "third\n");
+    lexer.lexan();
+    EXPECT_EQ(lexer.insertString("inserted", 5), 26);
+    lexer.lexan();
+    EXPECT_EQ(lexer.getTokenValIndex(), 27);
+    lexer.table()->removeValue(26);
+    lexer.lexan();
+    EXPECT_EQ(lexer.text(), "third");
+    EXPECT_EQ(lexer.getTokenValIndex(), 25) << padding;
   }
 }
 

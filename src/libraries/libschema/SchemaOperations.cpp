@@ -12,7 +12,8 @@
 // ---- Comparison ----
 
 // Drops from the manager's table what is excluded there, and what the reference defines alike.
-// Erased definitions are not deleted: the OID indexes still hold them.
+// Erased definitions are not deleted: the OID indexes of attribute types and object classes still
+// hold them.
 template <typename Definition>
 void SchemaManager::Operations::compare(SchemaManager* self, SchemaManager* reference) {
   using Rules = Kind<Definition>;

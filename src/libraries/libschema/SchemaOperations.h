@@ -135,7 +135,8 @@ struct SchemaManager::Operations {
   };
 
   // OIDs to take out of the file sets. Each is taken out at once while anything is traced, since a
-  // removal has records of its own; else all at the end of a walk, in the order of the sets.
+  // removal has records of its own; else all at the end of a walk, in the order of the sets. What
+  // is taken out is the same: removals of different OIDs do not touch each other.
   class Removals {
    public:
     explicit Removals(SchemaManager* manager) : m_manager(*manager) {}

@@ -310,7 +310,7 @@ inline Scanned scanToken(StreamInput* input, int* lineNumber, int* code) {
 
 // ---- Tokens in the buffer ----
 
-// A token that lies in the buffer as a whole, with the character after it.
+// A token that lies in the buffer as a whole; a text with the character after it, too.
 struct BufferedToken {
   const char* next;  // behind the token; null when it is not such a one, and no other member holds
   const char* text;  // where its text begins; null when it is a character

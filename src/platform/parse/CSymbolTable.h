@@ -170,10 +170,11 @@ inline std::string_view CSymbolTable::textAt(int index) const {
 }
 
 inline int CSymbolTable::replaceBorrowed(int index, std::string_view text, int token) {
-  if (index < 0 || index != m_borrower || index + 1 != static_cast<int>(m_used)) {
+  if (index < 0 || index != m_borrower || index + 1 != static_cast<int>(m_used) || m_holes != 0) {
     return addBorrowed(index, text, token);
   }
-  // The usual case: the last entry borrows one text after the other.
+  // The usual case: the last entry borrows one text after the other, and its slot is the one that
+  // the removal would leave to the addition.
   m_borrowed = text;
   m_entries[static_cast<std::size_t>(index)].token = token;
   return index;

@@ -45,7 +45,7 @@ class Clex_analyzer {
  protected:
   Clex_analyzer() = default;
 
-  CSymbolTable* m_symtable = nullptr;  // owned
+  CSymbolTable* m_symtable = nullptr;  // owned; the buffer of m_input can lie in its input room
   std::string m_filename;              // without the directory
   int m_tokenvalindex = -1;            // index of the current token's text, -1 when it has none
   std::ifstream m_input;
