@@ -1,9 +1,9 @@
 #include "TokenReader.h"
 
+#include <libschema/SchemaSymbolTable.h>
 #include <libschema/SchemaTokens.h>
 
 #include <algorithm>
-#include <array>
 #include <cstddef>
 
 namespace {
@@ -15,38 +15,27 @@ struct Keyword {
   int token;
 };
 
-// The last three are spellings that count as the first word of a definition too.
-constexpr std::array<Keyword, 28> kKeywords = {{
-    {"objectclasses", KEY_OBJECTCLASSES},
-    {"NAME", KEY_NAME},
-    {"DESC", KEY_DESC},
-    {"SUP", KEY_SUP},
-    {"AUXILIARY", KEY_AUXILIARY},
-    {"MUST", KEY_MUST},
-    {"MAY", KEY_MAY},
-    {"STRUCTURAL", KEY_STRUCTURAL},
-    {"attributetypes", KEY_ATTRIBUTETYPES},
-    {"EQUALITY", KEY_EQUALITY},
-    {"SYNTAX", KEY_SYNTAX},
-    {"SINGLE-VALUE", KEY_SINGLE_VALUE},
-    {"USAGE", KEY_USAGE},
-    {"NO-USER-MODIFICATION", KEY_NO_USER_MODIFICATION},
-    {"ORVAttributetypes", KEY_ORVATTRIBUTETYPES},
-    {"ACCESS-CLASS", KEY_ACCESS_CLASS},
-    {"DBNAME", KEY_DBNAME},
-    {"SUBSTR", KEY_SUBSTR},
-    {"REVERSE", KEY_REVERSE},
-    {"ORDERING", KEY_ORDERING},
-    {"COLLECTIVE", KEY_COLLECTIVE},
-    {"OBSOLETE", KEY_OBSOLETE},
-    {"ABSTRACT", KEY_ABSTRACT},
-    {"LENGTH", KEY_LENGTH},
-    {"APPROX", KEY_APPROX},
+// Spellings that count as the first word of a definition too, though they are no keywords.
+constexpr Keyword kSpellings[] = {
     {"objectClasses", KEY_OBJECTCLASSES},
     {"attributeTypes", KEY_ATTRIBUTETYPES},
     {"ORVattributeTypes", KEY_ORVATTRIBUTETYPES},
-}};
-constexpr std::size_t kLongestKeyword = 20;
+};
+
+// The token of a keyword; -1 for any other text.
+int keywordToken(std::string_view text) {
+  static SchemaSymbolTable keywords;
+  const int index = keywords.findText(text);
+  if (index >= 0) {
+    return keywords.getTokenValue(index);
+  }
+  for (const Keyword& spelling : kSpellings) {
+    if (text == spelling.text) {
+      return spelling.token;
+    }
+  }
+  return -1;
+}
 
 // The character classes of the "C" locale.
 constexpr bool isDigit(char c) { return c >= '0' && c <= '9'; }
@@ -247,12 +236,9 @@ int TokenReader::lookUp(int token) {
   if (m_hasStored && m_text == m_stored) {
     return m_storedToken;
   }
-  if (m_text.size() <= kLongestKeyword) {
-    for (const Keyword& keyword : kKeywords) {
-      if (m_text == keyword.text) {
-        return keyword.token;
-      }
-    }
+  const int keyword = keywordToken(m_text);
+  if (keyword >= 0) {
+    return keyword;
   }
   m_text.swap(m_stored);
   m_storedToken = token;
