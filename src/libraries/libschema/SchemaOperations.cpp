@@ -4,6 +4,7 @@
 #include "SchemaOperations.h"
 
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "SchemaManager.h"
@@ -124,17 +125,19 @@ void SchemaManager::Operations::eraseMoved(SchemaManager* source) {
   Table<Definition>& table = source->*Rules::kTable;
   typename Rules::KeyTest isKeyOf;
   Erasures<Definition> moved;
+  OidList movedOids;
   for (auto entry = table.begin(); entry != table.end(); ++entry) {
     if (isKeyOf(entry->first, *entry->second)) {
       moved.add(entry, Rules::keyAt(*entry));
     } else {
       moved.add(entry, Rules::keyOf(*entry->second));
     }
-    if constexpr (Rules::kHasFileSet) {
-      (source->*Rules::kOidTable).erase(entry->second->oidInPlace());
-    }
+    movedOids.push_back(&entry->second->oidInPlace());
   }
   moved.apply(&table);
+  if constexpr (Rules::kHasFileSet) {
+    eraseAll(&(source->*Rules::kOidTable), std::move(movedOids));
+  }
 }
 
 // Moves the source's definitions, in the order of their keys. Stops, with the source's tables as
@@ -220,7 +223,7 @@ void SchemaManager::Operations::check(SchemaManager* self, SchemaManager* refere
   Table<Definition>& table = self->*Rules::kTable;
   Walk<Definition> walk(*self, &(reference->*Rules::kTable));
   Erasures<Definition> dropped;
-  std::vector<const std::string*> collidingOids;
+  OidList collidingOids;
   for (auto entry = table.begin(); entry != table.end(); ++entry) {
     const Met<Definition> met = walk.meet(*entry);
     const std::string& oid = met.definition.oidInPlace();
@@ -231,9 +234,7 @@ void SchemaManager::Operations::check(SchemaManager* self, SchemaManager* refere
     }
   }
   dropped.apply(&table);
-  for (const std::string* const oid : collidingOids) {
-    reference->attrOidTable.erase(*oid);
-  }
+  eraseAll(&reference->attrOidTable, std::move(collidingOids));
 }
 
 // The order of the passes is its own: comparison and merge take object classes last.

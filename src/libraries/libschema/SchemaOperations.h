@@ -134,6 +134,25 @@ struct SchemaManager::Operations {
     std::vector<std::string> m_keys;
   };
 
+  using OidList = std::vector<const std::string*>;
+
+  static void sort(OidList* oids) {
+    std::sort(oids->begin(), oids->end(),
+              [](const std::string* left, const std::string* right) { return *left < *right; });
+  }
+
+  // Erases the entries of OIDs met in the order of names, in the order of the table.
+  template <typename Definition>
+  static void eraseAll(OidTable<Definition>* table, OidList oids) {
+    sort(&oids);
+    libschema::AscendingLookup<OidTable<Definition>> place(*table);
+    for (const std::string* const oid : oids) {
+      if (place.find(*oid) != table->end()) {
+        place.erase();
+      }
+    }
+  }
+
   // OIDs to take out of the file sets. Each is taken out at once while anything is traced, since a
   // removal has records of its own; else all at the end of a walk, in the order of the sets. What
   // is taken out is the same: removals of different OIDs do not touch each other.
@@ -151,8 +170,7 @@ struct SchemaManager::Operations {
 
     // An OID that came more than once is taken out of as many sets, the first ones that hold it.
     void apply() {
-      std::sort(m_oids.begin(), m_oids.end(),
-                [](const std::string* left, const std::string* right) { return *left < *right; });
+      sort(&m_oids);
       for (OidSet SchemaManager::*const fileSet : kFileSets) {
         OidSet& set = m_manager.*fileSet;
         libschema::AscendingLookup<OidSet> place(set);
@@ -170,7 +188,7 @@ struct SchemaManager::Operations {
 
    private:
     SchemaManager& m_manager;
-    std::vector<const std::string*> m_oids;
+    OidList m_oids;
   };
 
   // Puts `moved`, whose OID is the key of the entry, in the place of the entry's definition. The
