@@ -165,6 +165,36 @@ TEST(MergeSchemas, AdditionUnderAKnownOidLeavesTheIndexByOid) {
   EXPECT_EQ(attributeUnder(source.manager(), "1.1"), "nothing");
 }
 
+// Of two additions with one OID, the index takes the one whose name comes first.
+TEST(MergeSchemas, FirstOfTwoAdditionsIsFoundByTheirOid) {
+  const UnfreedDefinitions unfreed;
+  Installation installation{{"V3.system.at", attributeType("1.0", "z")}};
+  Installation source{{"V3.user.at", attributeType("1.1", "b") + attributeType("1.1", "a")},
+                      {"V3.user.oc", objectClass("2.1", "b") + objectClass("2.1", "a")}};
+  merge(&installation, &source);
+  EXPECT_EQ(stateOf(installation.manager()),
+            "attributes: a=1.1(text) b=1.1(text) z=1.0(text)\n"
+            "classes: a=2.1(text) b=2.1(text)\n"
+            "V3.user.oc: 2.1\nV3.user.at: 1.1\nV3.system.at: 1.0\n");
+  EXPECT_EQ(attributeUnder(installation.manager(), "1.1"), "a=1.1(text)");
+  EXPECT_EQ(objectClassUnder(installation.manager(), "2.1"), "a=2.1(text)");
+}
+
+// A replacement finds by its OID what the same merge has added, and takes it away.
+TEST(MergeSchemas, AdditionIsFoundByTheReplacementBehindIt) {
+  const UnfreedDefinitions unfreed;
+  Installation installation{{"V3.system.at", attributeType("1.2", "b", "mine")},
+                            {"V3.system.oc", objectClass("2.2", "b", "mine")}};
+  Installation source{{"V3.user.at", attributeType("1.1", "a") + attributeType("1.1", "b")},
+                      {"V3.user.oc", objectClass("2.1", "a") + objectClass("2.1", "b")}};
+  merge(&installation, &source);
+  EXPECT_EQ(stateOf(installation.manager()),
+            "attributes: b=1.2(mine)\nclasses: b=2.2(mine)\n"
+            "V3.user.oc: 2.1\nV3.user.at: 1.1\nV3.system.oc: 2.2\nV3.system.at: 1.2\n");
+  EXPECT_EQ(attributeUnder(installation.manager(), "1.1"), "b=1.1(text)");
+  EXPECT_EQ(objectClassUnder(installation.manager(), "2.1"), "b=2.1(text)");
+}
+
 TEST(MergeSchemas, ExclusionsAndModifiedSchemaHaveNoPartInIt) {
   Installation installation{{"V3.modifiedschema", attributeType("1.1", "a")}};
   Installation source{{"V3.user.at", attributeType("1.2", "b")},

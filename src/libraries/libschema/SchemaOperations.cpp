@@ -146,11 +146,13 @@ template <typename Definition>
 bool SchemaManager::Operations::merge(SchemaManager* self, SchemaManager* source) {
   using Rules = Kind<Definition>;
   Table<Definition>& table = self->*Rules::kTable;
+  Additions<Definition> additions(self);
   for (const auto& entry : source->*Rules::kTable) {
     Definition* const moved = entry.second;
     const auto& key = Rules::keyOf(*moved);
     const auto place = table.lower_bound(key);
     if (place != table.end() && place->first == key) {
+      additions.enter();
       if constexpr (Rules::kHasFileSet) {
         replace(self, key, place, moved);
       } else {
@@ -160,14 +162,13 @@ bool SchemaManager::Operations::merge(SchemaManager* self, SchemaManager* source
     }
     OidSet* const oids = findFileSet(self, source, moved->oidInPlace());
     if (oids == nullptr) {
+      additions.enter();
       return false;
     }
-    oids->insert(moved->oidInPlace());
+    additions.add(oids, moved);
     table.try_emplace(place, key, moved);
-    if constexpr (Rules::kHasFileSet) {
-      (self->*Rules::kOidTable).try_emplace(moved->oidInPlace(), moved);
-    }
   }
+  additions.enter();
   eraseMoved<Definition>(source);
   return true;
 }

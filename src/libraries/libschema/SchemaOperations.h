@@ -191,6 +191,58 @@ struct SchemaManager::Operations {
     OidList m_oids;
   };
 
+  // What a merge adds, to be entered by OID: in a file set and, unless it is a vendor extension, in
+  // the index. The names come in another order than the OIDs, and nobody looks an OID up before the
+  // next replacement, so that the entries wait until then and are made in the order of the OIDs.
+  template <typename Definition>
+  class Additions {
+   public:
+    explicit Additions(SchemaManager* manager) : m_manager(*manager) {}
+
+    void add(OidSet* set, Definition* moved) { m_waiting.push_back({set, moved}); }
+
+    void enter() {
+      // Of definitions with one OID the first one is entered.
+      std::stable_sort(m_waiting.begin(), m_waiting.end(),
+                       [](const Entry& left, const Entry& right) {
+                         return left.moved->oidInPlace() < right.moved->oidInPlace();
+                       });
+      Place<OidSet> inSet;
+      for (const Entry& entry : m_waiting) {
+        const std::string& oid = entry.moved->oidInPlace();
+        inSet = {entry.set, entry.set->insert(inSet.in(entry.set), oid)};
+      }
+      if constexpr (Kind<Definition>::kHasFileSet) {
+        OidTable<Definition>& index = m_manager.*Kind<Definition>::kOidTable;
+        auto place = index.end();
+        for (const Entry& entry : m_waiting) {
+          place = index.try_emplace(place, entry.moved->oidInPlace(), entry.moved);
+        }
+      }
+      m_waiting.clear();
+    }
+
+   private:
+    struct Entry {
+      OidSet* set;
+      Definition* moved;
+    };
+
+    // Where the last insertion was, and into which container.
+    template <typename Container>
+    struct Place {
+      Container* container = nullptr;
+      typename Container::iterator last = {};
+
+      typename Container::iterator in(Container* wanted) const {
+        return container == wanted ? last : wanted->end();
+      }
+    };
+
+    SchemaManager& m_manager;
+    std::vector<Entry> m_waiting;
+  };
+
   // Puts `moved`, whose OID is the key of the entry, in the place of the entry's definition. The
   // key lies in the definition, so it changes with it.
   template <typename Definition>
