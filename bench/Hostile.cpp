@@ -238,7 +238,8 @@ void addOidCases(std::vector<HostileCase>* list) {
   const Action merge = [](SchemaManager* older, SchemaManager* newer) {
     newer->mergeSchemas(older);
   };
-  list->push_back({"additions in a merge", kSize, withPair(kTypes, added, merge)});
+  // What is added to begins with nothing and leaves the cache later.
+  list->push_back({"additions in a merge", 2 * kSize, withPair(kTypes, added, merge)});
   list->push_back({"replacements in a merge", kSize, withPair(kTypes, equal, merge)});
   const Action check = [](SchemaManager* older, SchemaManager* newer) {
     older->checkCollisions(newer);
@@ -317,8 +318,9 @@ void addTableCases(std::vector<HostileCase>* list) {
     return types(n, std::string(500, 'n'), arc + ".");
   };
   list->push_back({"long common key prefixes, reading", 2500, reading(kTypes, longKeys)});
+  // More than the processor's own cache holds, as for the cases by OID.
   list->push_back(
-      {"long common key prefixes, comparison", 2500,
+      {"long common key prefixes, comparison", 10000,
        withPair(
            kTypes, [=](std::size_t n) { return std::make_pair(longKeys(n), longKeys(n)); },
            compare)});
