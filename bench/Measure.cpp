@@ -29,13 +29,17 @@ Sample measureHere(const Run& run, int repetitions) {
   Sample sample;
   forgetPeak();
   const double before = largestResidentBytes();
-  if (repetitions > 1) {
+  if (repetitions > 0) {
     run();
   }
   for (int i = 0; i < repetitions; ++i) {
     sample.seconds += run();
   }
-  sample.seconds /= repetitions;
+  if (repetitions > 0) {
+    sample.seconds /= repetitions;
+  } else {
+    sample.seconds = run();
+  }
   sample.peakBytes = largestResidentBytes() - before;
   sample.isComplete = true;
   return sample;
@@ -77,7 +81,7 @@ Sample measureInChild(const Run& run, int repetitions) {
 int repetitionsFor(const Run& run) {
   constexpr double kEnough = 0.03;
   constexpr double kMost = 100;
-  const double seconds = measureInChild(run, 1).seconds;
+  const double seconds = measureInChild(run, 0).seconds;
   return seconds <= 0 ? 1 : static_cast<int>(std::clamp(kEnough / seconds, 1.0, kMost));
 }
 

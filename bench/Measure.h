@@ -29,8 +29,8 @@ __attribute__((noinline)) double secondsOf(Action action) {
 // One run of a work: prepares, does the work, cleans up, and returns the seconds of the work alone.
 using Run = std::function<double()>;
 
-// Runs it in a child process: once when `repetitions` is 1, or else once unmeasured and then
-// `repetitions` times, with the mean as the result.
+// Runs it in a child process: once when `repetitions` is 0, or else once unmeasured and then
+// `repetitions` times in the same memory, with the mean as the result.
 Sample measureInChild(const Run& run, int repetitions);
 
 // How many repetitions in a child make a measurable time.

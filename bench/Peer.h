@@ -1,5 +1,7 @@
-// The peer: libldap's parsers of attribute types and object classes over the parenthesised text of
-// each definition of a file, with the results in two maps by first name and by OID.
+// The peer: libldap's parsers of attribute types and object classes over each definition of a file,
+// which it finds line by line, with the results in two maps by first name and by OID. The keys are
+// libldap's own texts. Memory is used again from file to file and from peer to peer: that for the
+// text of a file, that for the maps, and libldap's, which is given back in reverse.
 
 #ifndef LIBSCHEMA_BENCH_PEER_H
 #define LIBSCHEMA_BENCH_PEER_H
@@ -9,13 +11,16 @@
 
 #include <cstddef>
 #include <map>
+#include <memory_resource>
 #include <string>
+#include <string_view>
+#include <vector>
 
 namespace bench {
 
 class Peer {
  public:
-  Peer() = default;
+  Peer();
   ~Peer();
   Peer(const Peer&) = delete;
   Peer& operator=(const Peer&) = delete;
@@ -24,25 +29,31 @@ class Peer {
   bool readFile(const std::string& path);
 
   // How many definitions were met, and how many of them libldap refused.
-  std::size_t definitions() const { return m_definitions; }
+  std::size_t definitions() const {
+    return m_types.read.size() + m_classes.read.size() + m_refused;
+  }
   std::size_t refused() const { return m_refused; }
 
  private:
   template <typename Parsed>
   struct Tables {
-    std::map<std::string, Parsed*> byName;
-    std::map<std::string, Parsed*> byOid;
+    explicit Tables(std::pmr::memory_resource* nodes) : byName(nodes), byOid(nodes) {}
+
+    std::pmr::map<std::string_view, Parsed*> byName;
+    std::pmr::map<std::string_view, Parsed*> byOid;
+    std::vector<Parsed*> read;  // in the order of the files
   };
 
-  void readType(const char* text);
-  void readClass(const char* text);
+  bool readType(const char* text);
+  bool readClass(const char* text);
+  char* readDefinition(char* text, char* lineEnd, char* end, bool isType);
   template <typename Parsed>
-  void enter(Parsed* parsed, char** names, const char* oid, void (*release)(Parsed*),
-             Tables<Parsed>* tables);
+  void enter(Parsed* parsed, char** names, const char* oid, Tables<Parsed>* tables);
 
+  std::vector<std::byte> m_memory;
+  std::pmr::monotonic_buffer_resource m_nodes;
   Tables<LDAPAttributeType> m_types;
   Tables<LDAPObjectClass> m_classes;
-  std::size_t m_definitions = 0;
   std::size_t m_refused = 0;
 };
 

@@ -76,6 +76,19 @@ std::string memory(const std::vector<MemoryRow>& rows) {
   return text;
 }
 
+std::string checks(const std::vector<CheckRow>& rows) {
+  std::string text = line({"input", "time", "÷ own reading", "goal", "memory ÷ own reading", "goal",
+                           "exponent", "goal"}) +
+                     rule(1, 7);
+  for (const CheckRow& row : rows) {
+    text += line({row.input, duration(row.seconds), ratio(row.toReading),
+                  verdict(row.toReading, row.timeGoal), ratio(row.memoryToReading),
+                  verdict(row.memoryToReading, row.memoryGoal), ratio(row.exponent),
+                  verdict(row.exponent, row.growthGoal)});
+  }
+  return text;
+}
+
 std::string growth(const std::vector<GrowthRow>& rows) {
   std::string text =
       line({"input", "K", "time at K", "time at 4K", "exponent", "goal"}) + rule(1, 5);
@@ -98,6 +111,7 @@ std::string asMarkdown(const Results& results) {
   };
   section("Ratios", ratios(results.ratios), results.ratios.empty());
   section("Peak memory", memory(results.memory), results.memory.empty());
+  section("Checking an installation", checks(results.checks), results.checks.empty());
   section("Growth", growth(results.growth), results.growth.empty());
   return text;
 }

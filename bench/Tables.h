@@ -38,9 +38,23 @@ struct GrowthRow {
   double goal = 0;
 };
 
+// Checking an installation beside the library's own reading of it.
+struct CheckRow {
+  std::string input;
+  double definitions = 0;
+  double seconds = 0;
+  double toReading = 0;
+  double timeGoal = 0;
+  double memoryToReading = 0;
+  double memoryGoal = 0;
+  double exponent = 0;  // from the row before it on; 0 without one
+  double growthGoal = 0;
+};
+
 struct Results {
   std::vector<RatioRow> ratios;
   std::vector<MemoryRow> memory;
+  std::vector<CheckRow> checks;
   std::vector<GrowthRow> growth;
 };
 

@@ -162,12 +162,16 @@ double allBytes(const Input& input) { return sumOf(input.all, &FileList::bytes);
 double plainDefinitions(const Input& input) { return sumOf(input.plain, &FileList::definitions); }
 double plainBytes(const Input& input) { return sumOf(input.plain, &FileList::bytes); }
 
+// Small inputs have no goal.
 double peerGoalOf(const Input& input) {
   if (input.origin == Origin::kGenerated) {
-    return plainDefinitions(input) < 5000 ? 0 : 1.0;
+    const double definitions = plainDefinitions(input);
+    return definitions < 5000 ? 0 : definitions < 50000 ? 0.9 : 0.8;
   }
-  return input.origin == Origin::kReal ? 0.9 : 0;
+  return input.origin == Origin::kReal ? 1.0 : 0;
 }
+
+double floorGoalOf(const Input& input) { return peerGoalOf(input) > 0 ? 1.1 : 0; }
 
 template <typename Manager>
 Work::Maker plainReading() {
@@ -225,6 +229,7 @@ Work readingOfTypesAndClasses() {
   work.floor = plainReading<minimal::Schema>();
   work.peer = [](const Input& input, const std::string&) { return peerRun(input.plain); };
   work.peerGoal = peerGoalOf;
+  work.floorGoal = floorGoalOf;
   work.definitions = plainDefinitions;
   work.bytes = plainBytes;
   return work;
@@ -233,7 +238,7 @@ Work readingOfTypesAndClasses() {
 Work workOf(const char* name, double floorGoal, Work::Maker library, Work::Maker floor) {
   Work work;
   work.name = name;
-  work.floorGoal = floorGoal;
+  work.floorGoal = [floorGoal](const Input&) { return floorGoal; };
   work.library = std::move(library);
   work.floor = std::move(floor);
   work.definitions = allDefinitions;

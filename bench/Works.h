@@ -22,7 +22,8 @@ struct Work {
   Maker floor;
   Maker peer;
   std::function<bool(const Input&)> isMeasuredOn;  // empty: on every input
-  double floorGoal = 0;                            // 0: none
+  // At most so much of the other's time; 0, or empty, for no goal.
+  std::function<double(const Input&)> floorGoal;
   std::function<double(const Input&)> peerGoal;
   // What one run handles, for the rates.
   std::function<double(const Input&)> definitions;

@@ -21,6 +21,7 @@
 #include <string>
 #include <vector>
 
+#include "Checking.h"
 #include "Generator.h"
 #include "Hostile.h"
 #include "Inputs.h"
@@ -190,7 +191,7 @@ void measureWork(benchmark::State& state, const Work& work, const Input& input,
   row.toPeer = medianRatio(library.seconds, peer.seconds);
   row.peerGoal = work.peerGoal ? work.peerGoal(input) : 0;
   row.toFloor = medianRatio(library.seconds, floor.seconds);
-  row.floorGoal = work.floorGoal;
+  row.floorGoal = work.floorGoal ? work.floorGoal(input) : 0;
   state.counters["definitions/s"] = row.definitionsPerSecond;
   state.counters["bytes/s"] = row.bytesPerSecond;
   state.counters["library/libldap"] = row.toPeer;
@@ -203,7 +204,7 @@ void measureMemory(benchmark::State& state, const Work& reading, const Input& in
                    bench::Results* results) {
   Contender library(reading.library(input, ""));
   Contender floor(reading.floor(input, ""));
-  library.repetitions = floor.repetitions = 1;
+  library.repetitions = floor.repetitions = 0;
   for (auto _ : state) {
     library.measure();
     floor.measure();
@@ -219,6 +220,43 @@ void measureMemory(benchmark::State& state, const Work& reading, const Input& in
   state.counters["bytes/definition"] = row.library;
   state.counters["library/floor"] = row.ratio;
   results->memory.push_back(row);
+}
+
+// Time in repeated runs, memory in children that do it once. The inputs come in the order of their
+// sizes; growth is from one generated one to the next.
+void measureCheck(benchmark::State& state, const Input& input, bench::Results* results) {
+  Contender checking(bench::checkingRun(input));
+  Contender reading(bench::ownReadingRun(input));
+  Contender checkingOnce(bench::checkingRun(input));
+  Contender readingOnce(bench::ownReadingRun(input));
+  checkingOnce.repetitions = readingOnce.repetitions = 0;
+  for (auto _ : state) {
+    checking.measure();
+    reading.measure();
+    checkingOnce.measure();
+    readingOnce.measure();
+    state.SetIterationTime(checking.seconds.back());
+  }
+  bench::CheckRow row;
+  row.input = input.name;
+  row.definitions = input.olderFiles.definitions;
+  row.seconds = bench::median(checking.seconds);
+  row.toReading = medianRatio(checking.seconds, reading.seconds);
+  row.memoryToReading = medianRatio(checkingOnce.bytes, readingOnce.bytes);
+  if (bench::hasCheckGoals(input)) {
+    row.timeGoal = bench::kCheckTimeGoal;
+    row.memoryGoal = bench::kCheckMemoryGoal;
+  }
+  if (input.origin == Origin::kGenerated && !results->checks.empty() &&
+      bench::hasCheckGoals(input)) {
+    const bench::CheckRow& before = results->checks.back();
+    row.exponent =
+        std::log(row.seconds / before.seconds) / std::log(row.definitions / before.definitions);
+    row.growthGoal = bench::kCheckGrowthGoal;
+  }
+  state.counters["check/own reading"] = row.toReading;
+  state.counters["memory/own reading"] = row.memoryToReading;
+  results->checks.push_back(row);
 }
 
 void measureGrowth(benchmark::State& state, const bench::HostileCase& hostile,
@@ -259,7 +297,7 @@ bool verifyAll(const std::vector<Input>& inputs, const bench::TemporaryFolder& f
           }
           return 0.0;
         },
-        1);
+        0);
     if (!sample.isComplete) {
       return false;
     }
@@ -294,6 +332,10 @@ void addAll(const std::vector<Input>& inputs, const Options& options, const std:
       add("peak memory/" + input.name, 3,
           [&, results](benchmark::State& state) { measureMemory(state, reading, input, results); });
     }
+  }
+  for (const Input& input : inputs) {
+    add("check/" + input.name, roundsOf(input, options),
+        [&, results](benchmark::State& state) { measureCheck(state, input, results); });
   }
   if (!options.hasGrowth) {
     return;

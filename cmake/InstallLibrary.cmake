@@ -1,5 +1,6 @@
-# install_library(<header>...): the headers in one flat folder, the shared and the static library, and
-# the files by which CMake and pkg-config find them. The installed tree can be moved as a whole.
+# install_library(<header>...): the headers in one flat folder, the shared and the static library with
+# the platform behind them, and the files by which CMake and pkg-config find them. The installed tree
+# can be moved as a whole. A server's own platform is not installed, but referred to.
 
 include(CMakePackageConfigHelpers)
 
@@ -12,12 +13,46 @@ function(pkg_config_path path result)
   endif()
 endfunction()
 
+# Sets pc_prefix, pc_libdir and pc_includedir, and installs the file that `template` becomes with
+# them.
+function(install_pkg_config template)
+  file(RELATIVE_PATH pc_prefix "${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig" "${CMAKE_INSTALL_PREFIX}")
+  string(REGEX REPLACE "/$" "" pc_prefix "${pc_prefix}")
+  pkg_config_path("${CMAKE_INSTALL_LIBDIR}" pc_libdir)
+  pkg_config_path("${CMAKE_INSTALL_INCLUDEDIR}" pc_includedir)
+  get_filename_component(name ${template} NAME_WLE)
+  configure_file(${PROJECT_SOURCE_DIR}/cmake/${template} ${PROJECT_BINARY_DIR}/package/${name} @ONLY)
+  install(FILES ${PROJECT_BINARY_DIR}/package/${name} DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
+endfunction()
+
+# install_migration_library(<header>...): the same for the library behind it, in the package of
+# libschema.
+function(install_migration_library)
+  install(FILES ${ARGN} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/libschema-migration)
+  install(TARGETS migration migration_static EXPORT libschemaTargets
+          LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
+          ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR})
+  install_pkg_config(libschema-migration.pc.in)
+endfunction()
+
 function(install_library)
   set(package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/libschema)
-  set(pkg_config_dir ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
 
   install(FILES ${ARGN} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/libschema)
-  install(TARGETS schema schema_static EXPORT libschemaTargets
+  set(targets schema schema_static)
+  set(pc_stand_ins "-lschema-platform")
+  set(pc_platform "")
+  set(pc_platform_includes "")
+  if(LIBSCHEMA_PLATFORM)
+    set(pc_stand_ins "")
+    list(TRANSFORM server_platform_libraries PREPEND " " OUTPUT_VARIABLE pc_platform)
+    list(JOIN pc_platform "" pc_platform)
+    list(TRANSFORM server_platform_includes PREPEND " -I" OUTPUT_VARIABLE pc_platform_includes)
+    list(JOIN pc_platform_includes "" pc_platform_includes)
+  else()
+    list(APPEND targets schema_platform schema_platform_static)
+  endif()
+  install(TARGETS ${targets} EXPORT libschemaTargets
           LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
           ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR})
 
@@ -33,11 +68,5 @@ function(install_library)
                 ${PROJECT_BINARY_DIR}/package/libschemaConfigVersion.cmake
           DESTINATION ${package_dir})
 
-  file(RELATIVE_PATH pc_prefix "${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig" "${CMAKE_INSTALL_PREFIX}")
-  string(REGEX REPLACE "/$" "" pc_prefix "${pc_prefix}")
-  pkg_config_path("${CMAKE_INSTALL_LIBDIR}" pc_libdir)
-  pkg_config_path("${CMAKE_INSTALL_INCLUDEDIR}" pc_includedir)
-  configure_file(${PROJECT_SOURCE_DIR}/cmake/libschema.pc.in
-                 ${PROJECT_BINARY_DIR}/package/libschema.pc @ONLY)
-  install(FILES ${PROJECT_BINARY_DIR}/package/libschema.pc DESTINATION ${pkg_config_dir})
+  install_pkg_config(libschema.pc.in)
 endfunction()

@@ -3,6 +3,7 @@
 
 #include <array>
 #include <cstdarg>
+#include <cstdint>
 #include <cstdio>
 #include <string>
 

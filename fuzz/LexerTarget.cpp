@@ -108,9 +108,8 @@ std::vector<std::string> tokensIn(const std::string& text) {
 // Blanks in front change nothing, though they have the end of the first buffer of the input stream
 // fall on any place in the text.
 void readBehindBlanks(const std::string& text) {
-  // What the stream reads at a time: all of the room but the zero byte behind the data and the byte
-  // that the stream keeps.
-  constexpr std::size_t kBuffer = CSymbolTable::kInputRoom - 2;
+  // What the stream reads at a time: all of its buffer but the byte that it keeps.
+  constexpr std::size_t kBuffer = (1 << 15) - 1;
   const std::vector<std::string> expected = tokensIn(text);
   const std::size_t place = std::hash<std::string>()(text) % (text.size() + 1);
   const std::string blanks(kBuffer - std::min(place, kBuffer), ' ');

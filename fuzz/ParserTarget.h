@@ -29,13 +29,13 @@ inline std::vector<definitions::RecordedToken> record(SchemaLexan* lexer) {
 }
 
 inline bool areEqual(const Attribute& left, const Attribute& right) {
-  return left.attrsEqual(right) == 1;
+  return left.isEqualTo(right);
 }
 inline bool areEqual(const ObjectClass& left, const ObjectClass& right) {
-  return left.objsEqual(right);
+  return left.isEqualTo(right);
 }
 inline bool areEqual(const ORVAttribute& left, const ORVAttribute& right) {
-  return left.orvAttrsEqual(right);
+  return left.isEqualTo(right);
 }
 
 // What holds for every definition, whatever was read.

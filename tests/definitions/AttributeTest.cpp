@@ -187,16 +187,16 @@ TEST(AttributeMembers, GettersReturnCopies) {
 }
 
 TEST(AttributeMembers, FirstName) {
-  const Attribute named = parsed<Attribute>("=( 1.1 NAME ( 'commonName' 'CN' ) OBSOLETE )");
+  Attribute named = parsed<Attribute>("=( 1.1 NAME ( 'commonName' 'CN' ) OBSOLETE )");
   EXPECT_EQ(named.getFirstName(), "commonName");
   EXPECT_EQ(named.getFirstNameLower(), "commonname");
-  const Attribute unnamed;
+  Attribute unnamed;
   EXPECT_EQ(unnamed.getFirstName(), "");
   EXPECT_EQ(unnamed.getFirstNameLower(), "");
 }
 
 TEST(AttributeMembers, ConvertLowersEachCharacter) {
-  const Attribute attribute;
+  Attribute attribute;
   EXPECT_EQ(attribute.convert(""), "");
   EXPECT_EQ(attribute.convert("MiXed-09_Z ['@'"), "mixed-09_z ['@'");
   EXPECT_EQ(attribute.convert("\xC3\x84\xFF"), "\xC3\x84\xFF");
@@ -216,7 +216,7 @@ TEST(AttributeMembers, CopiesAreWholeAndTheirOwn) {
   std::string line;
   {
     Attribute full = parsed<Attribute>(kFull);
-    const Attribute constructed(full);
+    Attribute constructed(full);
     copy = constructed;
     EXPECT_EQ(copy.attrsEqual(full), 1);
     full = Attribute();
@@ -242,7 +242,7 @@ TEST(AttributeMembers, DeletedThroughTheBaseClass) {
 }
 
 // What attrsEqual gives from the left to the right and back.
-std::string equalBothWays(const Attribute& left, const Attribute& right) {
+std::string equalBothWays(Attribute left, Attribute right) {
   return std::to_string(left.attrsEqual(right)) + " " + std::to_string(right.attrsEqual(left));
 }
 
@@ -400,7 +400,7 @@ TEST(AttributeEquality, LongLists) {
 
 TEST(AttributeTrace, ExitRecordsCarryTheResult) {
   Attribute attribute = parsed<Attribute>("=( 1.1 )");
-  const Attribute other;
+  Attribute other;
   support::TraceRecorder recorder(support::kAllEvents);
   attribute.attrsEqual(attribute);
   attribute.attrsEqual(other);

@@ -313,7 +313,7 @@ TEST(Differences, ResultTypesAndTracedResults) {
   Attribute attribute;
   ObjectClass objectClass;
   ORVAttribute vendor;
-  const Attribute otherAttribute = parsed<Attribute>("=( 1.1 )");
+  Attribute otherAttribute = parsed<Attribute>("=( 1.1 )");
   const struct {
     const char* rule;
     std::function<void()> call;

@@ -138,7 +138,7 @@ TEST(ORVAttributeDump, EmptyAccessClassReadsBackAsNormal) {
 }
 
 TEST(ORVAttributeMembers, OnlyTheOidIsInherited) {
-  const ORVAttribute full = parsed<ORVAttribute>(kFull);
+  ORVAttribute full = parsed<ORVAttribute>(kFull);
   EXPECT_EQ(full.getOid(), "2.5.4.3");
   EXPECT_EQ(full.getDescription(), "");
   EXPECT_TRUE(full.getSuperior().empty());
@@ -151,7 +151,7 @@ TEST(ORVAttributeMembers, OnlyTheOidIsInherited) {
 }
 
 TEST(ORVAttributeMembers, ConvertLowersEachCharacter) {
-  const ORVAttribute entry;
+  ORVAttribute entry;
   EXPECT_EQ(entry.convert(""), "");
   EXPECT_EQ(entry.convert("MiXed-09_Z ['@'"), "mixed-09_z ['@'");
   EXPECT_EQ(entry.convert("\xC3\x84\xFF"), "\xC3\x84\xFF");
@@ -170,7 +170,7 @@ TEST(ORVAttributeMembers, CopiesAreWholeAndTheirOwn) {
   ORVAttribute copy;
   {
     ORVAttribute full = parsed<ORVAttribute>(kFull);
-    const ORVAttribute constructed(full);
+    ORVAttribute constructed(full);
     copy = constructed;
     EXPECT_TRUE(copy.orvAttrsEqual(full));
     EXPECT_EQ(&(full = ORVAttribute()), &full);
@@ -196,7 +196,7 @@ TEST(ORVAttributeMembers, DeletedThroughTheBaseClass) {
 }
 
 // What orvAttrsEqual gives from the left to the right and back.
-std::string equalBothWays(const ORVAttribute& left, const ORVAttribute& right) {
+std::string equalBothWays(ORVAttribute left, ORVAttribute right) {
   return std::to_string(left.orvAttrsEqual(right) ? 1 : 0) + " " +
          std::to_string(right.orvAttrsEqual(left) ? 1 : 0);
 }
@@ -293,7 +293,7 @@ TEST(ORVAttributeEquality, LongLists) {
     backwards += "nAME" + std::to_string(3999 - i) + " ";
   }
   const std::string head = "=( 1.1 DBNAME ( ";
-  const ORVAttribute right = parsed<ORVAttribute>(head + backwards + ") )");
+  ORVAttribute right = parsed<ORVAttribute>(head + backwards + ") )");
   EXPECT_EQ(equalBothWays(parsed<ORVAttribute>(head + forwards + ") )"), right), "1 1");
   const std::string repeats = replaced(forwards, "name0 ", "name1 ");
   EXPECT_EQ(equalBothWays(parsed<ORVAttribute>(head + repeats + ") )"), right), "1 0");
@@ -303,7 +303,7 @@ TEST(ORVAttributeEquality, LongLists) {
 
 TEST(ORVAttributeTrace, ExitRecordsCarryNoResult) {
   ORVAttribute entry = parsed<ORVAttribute>("=( 1.1 )");
-  const ORVAttribute other;
+  ORVAttribute other;
   support::TraceRecorder recorder(support::kAllEvents);
   entry.orvAttrsEqual(entry);
   entry.orvAttrsEqual(other);

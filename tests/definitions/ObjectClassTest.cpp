@@ -136,7 +136,7 @@ TEST(ObjectClassMembers, GettersReturnCopies) {
 }
 
 TEST(ObjectClassMembers, Defaults) {
-  const ObjectClass fresh;
+  ObjectClass fresh;
   EXPECT_EQ(fresh.getOid(), "");
   EXPECT_EQ(fresh.getDescription(), "");
   EXPECT_TRUE(fresh.getSuperior().empty());
@@ -146,16 +146,16 @@ TEST(ObjectClassMembers, Defaults) {
 }
 
 TEST(ObjectClassMembers, FirstName) {
-  const ObjectClass named = parsed<ObjectClass>("=( 1.1 NAME ( 'inetOrgPerson' 'B' ) OBSOLETE )");
+  ObjectClass named = parsed<ObjectClass>("=( 1.1 NAME ( 'inetOrgPerson' 'B' ) OBSOLETE )");
   EXPECT_EQ(named.getFirstName(), "inetOrgPerson");
   EXPECT_EQ(named.getFirstNameLower(), "inetorgperson");
-  const ObjectClass unnamed;
+  ObjectClass unnamed;
   EXPECT_EQ(unnamed.getFirstName(), "");
   EXPECT_EQ(unnamed.getFirstNameLower(), "");
 }
 
 TEST(ObjectClassMembers, ConvertLowersEachCharacter) {
-  const ObjectClass objectClass;
+  ObjectClass objectClass;
   EXPECT_EQ(objectClass.convert(""), "");
   EXPECT_EQ(objectClass.convert("MiXed-09_Z ['@'"), "mixed-09_z ['@'");
   EXPECT_EQ(objectClass.convert("\xC3\x84\xFF"), "\xC3\x84\xFF");
@@ -174,7 +174,7 @@ TEST(ObjectClassMembers, CopiesAreWholeAndTheirOwn) {
   ObjectClass copy;
   {
     ObjectClass full = parsed<ObjectClass>(kFull);
-    const ObjectClass constructed(full);
+    ObjectClass constructed(full);
     copy = constructed;
     EXPECT_TRUE(copy.objsEqual(full));
     full = ObjectClass();
@@ -200,7 +200,7 @@ TEST(ObjectClassMembers, DeletedThroughTheBaseClass) {
 }
 
 // What objsEqual gives from the left to the right and back.
-std::string equalBothWays(const ObjectClass& left, const ObjectClass& right) {
+std::string equalBothWays(ObjectClass left, ObjectClass right) {
   return std::to_string(left.objsEqual(right) ? 1 : 0) + " " +
          std::to_string(right.objsEqual(left) ? 1 : 0);
 }
@@ -298,8 +298,8 @@ TEST(ObjectClassEquality, LongLists) {
     const std::string head = "=( 1.1 " + clause + " ( ";
     const std::string tail = ") OBSOLETE )";
     const std::string members = longList("name", true);
-    const ObjectClass left = parsed<ObjectClass>(head + members + tail);
-    const ObjectClass right = parsed<ObjectClass>(head + longList("nAME", false) + tail);
+    ObjectClass left = parsed<ObjectClass>(head + members + tail);
+    ObjectClass right = parsed<ObjectClass>(head + longList("nAME", false) + tail);
     EXPECT_EQ(equalBothWays(left, right), "1 1");
     const std::string repeats = replaced(members, "name0 ", "name1 ");
     EXPECT_EQ(equalBothWays(parsed<ObjectClass>(head + repeats + tail), right), "1 0");
@@ -310,7 +310,7 @@ TEST(ObjectClassEquality, LongLists) {
 
 TEST(ObjectClassTrace, ExitRecordsCarryNoResult) {
   ObjectClass objectClass = parsed<ObjectClass>("=( 1.1 )");
-  const ObjectClass other;
+  ObjectClass other;
   support::TraceRecorder recorder(support::kAllEvents);
   objectClass.objsEqual(objectClass);
   objectClass.objsEqual(other);

@@ -57,9 +57,9 @@ TEST(Boundary, BlanksBeforeATextChangeNothing) {
   }
 }
 
-// How much lies in the buffer of the stream at a time: the room of the table, less the zero byte
-// behind the data and the byte that the stream keeps. And of a stream that has a buffer of its own.
-constexpr std::size_t kBuffers[] = {CSymbolTable::kInputRoom - 2, 8191};
+// How much lies in the buffer of the stream at a time: all of it but the byte that the stream
+// keeps. And of a stream with a buffer of the usual size.
+constexpr std::size_t kBuffers[] = {(1 << 15) - 1, 8191};
 
 TEST(Boundary, NewlinesBeforeATextOnlyMoveItsLines) {
   for (const std::size_t buffer : kBuffers) {

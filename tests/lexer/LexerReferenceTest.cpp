@@ -6,6 +6,7 @@
 #include <random>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "LexerTesting.h"
 #include "ReferenceLexer.h"
@@ -21,8 +22,10 @@ std::string state(int token, const std::string& text, int index, int current, in
          std::to_string(current) + " line " + std::to_string(line);
 }
 
-std::string state(int token, OpenLexer* lexer) {
-  return state(token, lexer->text(), lexer->getTokenValIndex(), lexer->getCurrentToken(),
+std::string state(int token, SchemaLexan* lexer) {
+  std::string text;
+  lexer->getStringValue(lexer->getTokenValIndex(), text);
+  return state(token, text, lexer->getTokenValIndex(), lexer->getCurrentToken(),
                lexer->getLineNumber());
 }
 
@@ -30,43 +33,79 @@ std::string state(int token, const ReferenceLexer& lexer) {
   return state(token, lexer.text(), lexer.valueIndex(), lexer.currentToken(), lexer.line());
 }
 
-// Reads both to the end and twice more. Returns "" when they agree all the way.
-std::string differenceOverLexan(const std::string& text) {
-  OpenLexer lexer(text);
-  ReferenceLexer reference(lexertesting::inputDirectory() + "/" + lexertesting::kInputName);
-  for (int behindEnd = 0; behindEnd < 3;) {
-    const int expectedToken = reference.lexan();
-    const std::string expected = state(expectedToken, reference);
-    const std::string actual = state(lexer.lexan(), &lexer);
-    if (actual != expected) {
-      return printable("got " + actual + ", expected " + expected + " in " + text);
+// The analysers that must agree over one text: in a file, as a caller makes it and as the base of a
+// class; over bytes in memory; and the reference.
+class Analysers {
+ public:
+  explicit Analysers(const std::string& text) : m_text(text) {}
+
+  // Lets all read a token and returns "" when they agree, and the token in *token.
+  std::string lexan(int* token) {
+    *token = m_reference.lexan();
+    return differenceTo(state(*token, m_reference), [](SchemaLexan* lexer) {
+      const int code = lexer->lexan();
+      return state(code, lexer);
+    });
+  }
+
+  std::string match(int asked) {
+    m_reference.match(asked);
+    return differenceTo(state(0, m_reference), [asked](SchemaLexan* lexer) {
+      lexer->match(asked);
+      return state(0, lexer);
+    });
+  }
+
+  int currentToken() const { return m_reference.currentToken(); }
+
+ private:
+  template <typename Step>
+  std::string differenceTo(const std::string& expected, Step step) {
+    const std::pair<const char*, SchemaLexan*> lexers[] = {
+        {"derived", &m_derived}, {"file", &m_file}, {"bytes", &m_bytes}};
+    for (const auto& [name, lexer] : lexers) {
+      const std::string actual = step(lexer);
+      if (actual != expected || lexer->fileIsOpen() != m_derived.fileIsOpen()) {
+        return printable(std::string(name) + " got " + actual + ", expected " + expected + " in " +
+                         m_text);
+      }
     }
-    behindEnd += expectedToken == 260 ? 1 : 0;
+    return "";
+  }
+
+  const std::string m_text;
+  OpenLexer m_derived{m_text};
+  SchemaLexan m_file{lexertesting::inputDirectory(), lexertesting::kInputName};
+  SchemaLexan m_bytes{m_text.data(), m_text.size(), "", ""};
+  ReferenceLexer m_reference{lexertesting::inputDirectory() + "/" + lexertesting::kInputName};
+};
+
+// Reads all to the end and twice more. Returns "" when they agree all the way.
+std::string differenceOverLexan(const std::string& text) {
+  Analysers analysers(text);
+  for (int behindEnd = 0; behindEnd < 3;) {
+    int token = 0;
+    const std::string difference = analysers.lexan(&token);
+    if (!difference.empty()) {
+      return difference;
+    }
+    behindEnd += token == 260 ? 1 : 0;
   }
   return "";
 }
 
 // The same, reading by lexan() and match() in an order that `seed` gives.
 std::string differenceOverMatch(const std::string& text, std::mt19937::result_type seed) {
-  OpenLexer lexer(text);
-  ReferenceLexer reference(lexertesting::inputDirectory() + "/" + lexertesting::kInputName);
+  Analysers analysers(text);
   std::mt19937 random(seed);
   for (std::size_t step = 0; step < text.size() + 5; ++step) {
     const auto choice = random() % 4;
-    int expectedToken = 0;
     int token = 0;
-    if (choice == 0) {
-      expectedToken = reference.lexan();
-      token = lexer.lexan();
-    } else {
-      const int asked = choice == 1 ? 40 : reference.currentToken();
-      reference.match(asked);
-      lexer.match(asked);
-    }
-    const std::string expected = state(expectedToken, reference);
-    const std::string actual = state(token, &lexer);
-    if (actual != expected) {
-      return printable("got " + actual + ", expected " + expected + " in " + text);
+    const std::string difference =
+        choice == 0 ? analysers.lexan(&token)
+                    : analysers.match(choice == 1 ? 40 : analysers.currentToken());
+    if (!difference.empty()) {
+      return difference;
     }
   }
   return "";
@@ -238,7 +277,7 @@ TEST(AgainstReference, EverySuffixOfAFile) {
 }
 
 TEST(AgainstReference, MissingFile) {
-  OpenLexer lexer(lexertesting::inputDirectory(), "not there");
+  SchemaLexan lexer(lexertesting::inputDirectory(), "not there");
   ReferenceLexer reference(lexertesting::inputDirectory() + "/not there");
   EXPECT_EQ(state(lexer.lexan(), &lexer), state(reference.lexan(), reference));
 }

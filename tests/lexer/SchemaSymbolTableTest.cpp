@@ -287,9 +287,42 @@ TEST(CSymbolTable, IndexOutsideTheTableHasNoValue) {
     EXPECT_FALSE(table.isCharacter(index)) << index;
     EXPECT_FALSE(table.getValue(index, text)) << index;
     EXPECT_FALSE(table.getValue(index, character)) << index;
+    EXPECT_EQ(table.getTokenValue(index), -1) << index;
   }
   EXPECT_EQ(text, "untouched");
   EXPECT_EQ(character, '?');
+}
+
+TEST(CSymbolTable, RemovedIndexHasNoTokenCode) {
+  CSymbolTable table;
+  const int text = table.insertValue(std::string("x"), 7, true);
+  const int character = table.insertValue('x', 8, false);
+  const int last = table.insertValue(std::string("y"), 9, false);
+  table.removeValue(text);
+  table.removeValue(character);
+  EXPECT_EQ(table.getTokenValue(text), -1);
+  EXPECT_EQ(table.getTokenValue(character), -1);
+  EXPECT_EQ(table.getTokenValue(last), 9);
+  table.removeValue(last);
+  EXPECT_EQ(table.getTokenValue(last), -1);
+}
+
+// Behind a removed last entry the removed ones before it go, too.
+TEST(CSymbolTable, IndexesBehindTheLastEntryAreGivenOutAgain) {
+  CSymbolTable table;
+  table.insertValue(std::string("a"), 1, false);
+  table.insertValue(std::string("b"), 2, false);
+  table.insertValue(std::string("c"), 3, false);
+  table.removeValue(1);
+  EXPECT_EQ(table.insertValue(std::string("d"), 4, false), 3);
+  table.removeValue(3);
+  EXPECT_EQ(table.insertValue(std::string("e"), 5, false), 3);
+  table.removeValue(3);
+  table.removeValue(2);
+  EXPECT_EQ(table.insertValue(std::string("f"), 6, false), 1);
+  EXPECT_EQ(table.getTableSize(), 2);
+  EXPECT_EQ(table.lookUpValue("a"), 0);
+  EXPECT_EQ(table.lookUpValue("f"), 1);
 }
 
 TEST(CSymbolTable, LookUpByCodeReturnsTheLowestIndexFromTheFirstOn) {

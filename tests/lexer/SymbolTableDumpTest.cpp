@@ -41,6 +41,24 @@ TEST(SymbolTableDump, HasAHeadingAndOneLineForEachEntryInOrder) {
   }
 }
 
+TEST(SymbolTableDump, LineShowsIndexCodeValueAndWhetherItIsAKeyword) {
+  CSymbolTable table;
+  table.insertValue(std::string("NAME"), 1003, true);
+  table.insertValue(std::string("a 'b'"), 259, false);
+  table.insertValue('(', 40, true);
+  table.insertValue('x', -56, false);
+  table.insertValue(std::string(), 0, false);
+  table.removeValue(2);
+  EXPECT_EQ(dumpOf(&table, 1),
+            "\tCSymbolTable, 4 entries\n"
+            "\t0 1003 \"NAME\" keyword\n"
+            "\t1 259 \"a 'b'\"\n"
+            "\t3 -56 'x'\n"
+            "\t4 0 \"\"\n");
+  table.insertValue(')', 41, true);
+  EXPECT_EQ(support::splitLines(dumpOf(&table, 0)).back(), "5 41 ')' keyword");
+}
+
 TEST(SymbolTableDump, EveryLineIsIndentedByTheLevel) {
   SchemaSymbolTable table;
   const std::vector<std::string> plain = support::splitLines(dumpOf(&table, 0));

@@ -19,6 +19,7 @@
 #include "DiagnosticPlace.h"
 #include "Files.h"
 #include "Installation.h"
+#include "Machine.h"
 #include "SmallFileSystem.h"
 
 using namespace support;
@@ -152,8 +153,7 @@ TEST(DiagnosticFiles, AnotherUsersFileThatIsShutStaysAsItIs) {
     SCOPED_TRACE(path);
     const DiagnosticPlace place(path);
     std::ofstream(path) << "theirs\n";
-    // To others than root it has to be shut even though it is their own.
-    ASSERT_EQ(0, ::chmod(path, ::geteuid() == 0 ? 0600 : 0));
+    ASSERT_EQ(0, ::chmod(path, shutMode()));
     giveToAnotherUser(path);
     const struct stat before = statusOf(path);
     {
@@ -206,17 +206,9 @@ TEST(DiagnosticFiles, NoRoomUnderTheLimitsOfTheProcess) {
   }
 }
 
-// Of the file system, which runs out of blocks or of inodes; seen where this process may mount one.
+// Of the file system, which runs out of blocks or of inodes.
 TEST(DiagnosticFiles, NoSpaceInTheFileSystem) {
-  if (!SmallFileSystem::canBeMade()) {
-    // All that is left to try here is a place that takes nothing.
-    const DiagnosticPlace place(kOpenedFiles[0]);
-    ASSERT_EQ(0, ::symlink("/dev/full", place.path()));
-    Installation installation;
-    expectSameReading(
-        &installation, [] {}, [] {});
-    return;
-  }
+  SKIP_UNLESS_MACHINE_CAN(kMountFileSystems);
   for (const bool isOutOfInodes : {false, true}) {
     SCOPED_TRACE(isOutOfInodes ? "inodes" : "blocks");
     const SmallFileSystem small("/tmp", "mode=1777,size=256k,nr_inodes=40");

@@ -54,7 +54,7 @@ std::string oidsOf(const std::string& printed) {
 }
 
 template <typename Definition>
-std::string found(const Definition& definition) {
+std::string found(Definition definition) {
   if (definition.getOid().empty() && definition.getNames().empty() &&
       definition.getDescription().empty()) {
     return "nothing";

@@ -8,7 +8,20 @@ major=${VERSION%%.*}
 lib=$(dirname "$(find "$PREFIX" -name libschema.a)")
 libraries=$(cd "$lib" && ls -d libschema*)
 headers=$(cd "$PREFIX/include/libschema" && ls)
-soname=$(objdump -p "$lib/libschema.so" | awk '$1 == "SONAME" { print $2 }')
+
+# entries KIND LIBRARY: the values of this kind in the dynamic section, but for the system's libraries.
+entries() {
+  objdump -p "$lib/$2" | awk -v kind="$1" '$1 == kind && (kind != "NEEDED" || /schema/) { print $2 }'
+}
+
+# defined LIBRARY: the symbols that the shared library gives, demangled, but for those of templates.
+defined() {
+  nm -DC --defined-only "$lib/$1" | cut -d ' ' -f 3- | grep -v '^std::'
+}
+
+libraries_of_pkg_config() {
+  PKG_CONFIG_PATH=$lib/pkgconfig "$PKG_CONFIG" "$@" --libs-only-l libschema | sed 's/ *$//'
+}
 
 expect "headers" "Attribute.h
 CSymbolTable.h
@@ -16,19 +29,55 @@ Clex_analyzer.h
 ORVAttribute.h
 ORVSchema.h
 ObjectClass.h
+PlacedLexan.h
 SchemaLexan.h
 SchemaManager.h
 SchemaSymbolTable.h
 SchemaTokens.h
 ldtr.h
 timestamp.h" "$headers"
-expect "libraries" "libschema.a
+expect "libraries" "libschema-migration.a
+libschema-migration.so
+libschema-migration.so.$major
+libschema-migration.so.$VERSION
+libschema-platform.a
+libschema-platform.so
+libschema-platform.so.$major
+libschema-platform.so.$VERSION
+libschema.a
 libschema.so
 libschema.so.$major
 libschema.so.$VERSION" "$libraries"
-expect "SONAME" "libschema.so.$major" "$soname"
-expect "version by pkg-config" "$VERSION" \
-  "$(PKG_CONFIG_PATH=$lib/pkgconfig "$PKG_CONFIG" --modversion libschema)"
+expect "SONAME" "libschema.so.$major" "$(entries SONAME libschema.so)"
+expect "SONAME of the platform" "libschema-platform.so.$major" "$(entries SONAME libschema-platform.so)"
+expect "libraries behind libschema" "libschema-platform.so.$major" "$(entries NEEDED libschema.so)"
+expect "SONAME of libschema-migration" "libschema-migration.so.$major" \
+  "$(entries SONAME libschema-migration.so)"
+expect "libraries behind libschema-migration" "libschema.so.$major" \
+  "$(entries NEEDED libschema-migration.so)"
+expect "where libschema-migration looks for them" "\$ORIGIN" \
+  "$(entries RUNPATH libschema-migration.so)"
+expect "symbols of libschema-migration but its own" "" \
+  "$(defined libschema-migration.so | grep -v 'migration::' | sort)"
+expect "libraries behind the platform" "" "$(entries NEEDED libschema-platform.so)"
+expect "where libschema looks for the platform" "\$ORIGIN" "$(entries RUNPATH libschema.so)"
+expect "symbols of the platform" "getCurrentTimeStamp[abi:cxx11](int)
+ldtr_exit_errcode(unsigned long, unsigned long, unsigned long, long, void const*)
+ldtr_formater_global::debug(unsigned long, char const*, ...)
+ldtr_formater_local::debug(unsigned long, char const*, ...)
+ldtr_fun
+ldtr_write(unsigned long, unsigned long, void const*)
+libschema_trace_events
+trcEvents" "$(defined libschema-platform.so | sort)"
+expect "symbols of libschema that a server has, too" "" \
+  "$(defined libschema.so | grep -E '^(ldtr_|trcEvents|getCurrentTimeStamp|CSymbolTable|Clex_analyzer)')"
+expect "what a program is linked with" "-lschema" "$(libraries_of_pkg_config)"
+expect "what a static program is linked with" "-lschema -lschema-platform" \
+  "$(libraries_of_pkg_config --static)"
+for package in libschema libschema-migration; do
+  expect "version of $package by pkg-config" "$VERSION" \
+    "$(PKG_CONFIG_PATH=$lib/pkgconfig "$PKG_CONFIG" --modversion "$package")"
+done
 expect "tool" "schema-migrate $VERSION" "$("$PREFIX/bin/schema-migrate" --version)"
 [ -s "$PREFIX/share/man/man1/schema-migrate.1" ] || expect "man page" "schema-migrate.1" "none"
 

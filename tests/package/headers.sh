@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# Every installed header compiles alone, under both of its names.
+# Every installed header compiles alone, those of libschema under both of their names.
 
 set -euo pipefail
 
@@ -13,4 +13,9 @@ for header in "$PREFIX"/include/libschema/*.h; do
     "$CXX" "${flags[@]}" -fsyntax-only -x c++ -
   count=$((count + 1))
 done
-[ "$count" -gt 0 ]
+for header in "$PREFIX"/include/libschema-migration/*.h; do
+  printf '#include <libschema-migration/%s>\n' "$(basename "$header")" |
+    "$CXX" "${flags[@]}" -fsyntax-only -x c++ -
+  count=$((count + 1))
+done
+[ "$count" -gt 20 ]

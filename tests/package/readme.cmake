@@ -1,4 +1,4 @@
-# What README.md shows is what there is: its program is the one that the tests build and run, and its
+# What README.md shows is what there is: its programs are those that the tests build and run, and its
 # summary the one that the tool prints for the examples.
 
 file(READ ${README} readme)
@@ -10,8 +10,11 @@ function(expect_in_readme what text)
   endif()
 endfunction()
 
-file(READ ${EXAMPLE} example)
-expect_in_readme("the text of ${EXAMPLE}" "```cpp\n${example}```")
+file(GLOB programs ${PROGRAMS}/migration/*.cpp)
+foreach(program IN ITEMS ${PROGRAMS}/consumer/takeover.cpp ${programs})
+  file(READ ${program} text)
+  expect_in_readme("the text of ${program}" "```cpp\n${text}```")
+endforeach()
 
 file(REMOVE_RECURSE ${OUT})
 execute_process(

@@ -83,9 +83,8 @@ TEST(LocaleFolding, CheckReportsWhatItCannotRemove) {
             "classes: item=2.1(text) other=2.2(text)\n");
 }
 
-// The target has "za" already: it keeps it, and what has been moved is found by its OID there. The
-// source still has it under "qa".
-TEST(LocaleFolding, MergeLeavesTheEntryOfTheSource) {
+// The target has "za" already: it keeps it, and what has been moved is found by its OID there.
+TEST(LocaleFolding, MergeIntoATargetThatHasTheFoldedName) {
   const UnfreedDefinitions unfreed;
   Installation target{{"V3.user.at", bothKinds("2", "Za")}};
   Installation source{{"V3.user.at", bothKinds("1", "Qa")}};
@@ -97,8 +96,39 @@ TEST(LocaleFolding, MergeLeavesTheEntryOfTheSource) {
             "attributes: za=1.2(text)\nclasses: za=2.2(text)\nV3.user.at: 1.2 2.2\n");
   EXPECT_EQ(attributeUnder(target.manager(), "1.1"), "qa=1.1(text)");
   EXPECT_EQ(objectClassUnder(target.manager(), "2.1"), "qa=2.1(text)");
-  EXPECT_EQ(tablesOf(source.manager()), "attributes: qa=1.1(text)\nclasses: qa=2.1(text)\n");
+  EXPECT_EQ(tablesOf(source.manager()), "");
   EXPECT_EQ(attributeUnder(source.manager(), "1.1"), "nothing");
+}
+
+// What has been moved belongs to the target alone, whatever its name gives now: both managers can
+// be destroyed.
+TEST(LocaleFolding, MergeLeavesNothingInTheSource) {
+  Installation target;
+  Installation source{{"V3.user.at", bothKinds("1", "Qa") + bothKinds("2", "Zb")}};
+  {
+    const OtherFolding folding('Q', 'z');
+    EXPECT_TRUE(target->mergeSchemas(source.manager()));
+  }
+  EXPECT_EQ(stateOf(target.manager()),
+            "attributes: za=1.1(text) zb=1.2(text)\nclasses: za=2.1(text) zb=2.2(text)\n"
+            "V3.user.at: 1.1 1.2 2.1 2.2\n");
+  EXPECT_EQ(tablesOf(source.manager()), "");
+}
+
+// A name that gives another one than its key in any of its letters is not found in the reference,
+// and its own entry stays.
+TEST(LocaleFolding, EveryLetterOfANameCounts) {
+  for (const char* name : {"Qabc", "aQbc", "abQc", "abcQ"}) {
+    SCOPED_TRACE(name);
+    Installation installation{{"V3.user.at", bothKinds("1", name)}};
+    Installation reference{{"V3.user.at", bothKinds("1", name)}};
+    const std::string whole = stateOf(installation.manager());
+    {
+      const OtherFolding folding('Q', 'z');
+      compare(&installation, &reference);
+    }
+    EXPECT_EQ(stateOf(installation.manager()), whole);
+  }
 }
 
 }  // namespace

@@ -30,6 +30,22 @@ class BrokenFile {
   static int failures();
 };
 
+// How many characters have been folded by tolower, and how many texts compared by memcmp, so far.
+long foldings();
+long comparisons();
+
+// How many times the program has asked for a piece of a file, or of a directory, so far.
+int reads();
+
+// While an object of this class lives, the allocation with this number fails, the next being 1.
+class FailingAllocation {
+ public:
+  explicit FailingAllocation(int number);
+  ~FailingAllocation();
+  FailingAllocation(const FailingAllocation&) = delete;
+  FailingAllocation& operator=(const FailingAllocation&) = delete;
+};
+
 }  // namespace platform
 
 #endif  // LIBSCHEMA_TESTS_PLATFORM_FUNCTIONS_H

@@ -23,12 +23,10 @@ using properties::sizeOf;
 using properties::State;
 using properties::stateOf;
 
-bool areEqual(const Attribute& mine, const Attribute& theirs) {
-  return mine.attrsEqual(theirs) == 1;
-}
-bool areEqual(const ObjectClass& mine, const ObjectClass& theirs) { return mine.objsEqual(theirs); }
+bool areEqual(const Attribute& mine, const Attribute& theirs) { return mine.isEqualTo(theirs); }
+bool areEqual(const ObjectClass& mine, const ObjectClass& theirs) { return mine.isEqualTo(theirs); }
 bool areEqual(const ORVAttribute& mine, const ORVAttribute& theirs) {
-  return mine.orvAttrsEqual(theirs);
+  return mine.isEqualTo(theirs);
 }
 
 // The state without its three tables: what a comparison does not prune, but for the file sets.

@@ -72,9 +72,9 @@ struct OpenAttribute : Attribute {
 };
 
 std::vector<std::string> quotedTexts(const ORVSchema& definition) {
-  std::vector<std::string> quoted = definition.getNames();
-  if (!definition.getDescription().empty()) {
-    quoted.push_back(definition.getDescription());
+  std::vector<std::string> quoted = definition.namesInPlace();
+  if (!definition.descriptionInPlace().empty()) {
+    quoted.push_back(definition.descriptionInPlace());
   }
   return quoted;
 }
@@ -125,11 +125,9 @@ std::string lineOf(const Definition& definition) {
   return line;
 }
 
-bool areEqual(const Attribute& left, const Attribute& right) { return left.attrsEqual(right) == 1; }
-bool areEqual(const ObjectClass& left, const ObjectClass& right) { return left.objsEqual(right); }
-bool areEqual(const ORVAttribute& left, const ORVAttribute& right) {
-  return left.orvAttrsEqual(right);
-}
+bool areEqual(const Attribute& left, const Attribute& right) { return left.isEqualTo(right); }
+bool areEqual(const ObjectClass& left, const ObjectClass& right) { return left.isEqualTo(right); }
+bool areEqual(const ORVAttribute& left, const ORVAttribute& right) { return left.isEqualTo(right); }
 
 template <typename Definition>
 std::string differenceOf(const char* name, const Table<Definition>& expected,
@@ -180,20 +178,20 @@ bool allIn(const Table<Definition>& table) {
 }  // namespace
 
 bool readsBack(const Attribute& definition) {
-  return canBeOid(definition.getOid()) && OpenAttribute(definition).hasPlainValues() &&
-         !isTakenForOid(definition.getOid(), quotedTexts(definition));
+  return canBeOid(definition.oidInPlace()) && OpenAttribute(definition).hasPlainValues() &&
+         !isTakenForOid(definition.oidInPlace(), quotedTexts(definition));
 }
 
 bool readsBack(const ObjectClass& definition) {
-  return canBeOid(definition.getOid()) && areWords(definition.getSuperior()) &&
-         areWords(definition.getReqAttrs()) && areWords(definition.getOptAttrs()) &&
-         !isTakenForOid(definition.getOid(), quotedTexts(definition));
+  return canBeOid(definition.oidInPlace()) && areWords(definition.superiorsInPlace()) &&
+         areWords(definition.reqAttrsInPlace()) && areWords(definition.optAttrsInPlace()) &&
+         !isTakenForOid(definition.oidInPlace(), quotedTexts(definition));
 }
 
 bool readsBack(const ORVAttribute& definition) {
-  return canBeOid(definition.getOid()) && isAnyToken(accessOf(definition)) &&
+  return canBeOid(definition.oidInPlace()) && isAnyToken(accessOf(definition)) &&
          isAnyToken(lengthOf(definition)) &&
-         !isTakenForOid(definition.getOid(), databaseNamesOf(definition));
+         !isTakenForOid(definition.oidInPlace(), databaseNamesOf(definition));
 }
 
 bool allReadBack(const SchemaManager& manager, const std::string& file) {

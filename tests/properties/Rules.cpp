@@ -144,7 +144,7 @@ bool mergeAttributes(State* self, State* source) {
   for (const auto& entry : source->attrTable) {
     Attribute* const moved = entry.second;
     if (self->attrTable.count(moved->getFirstNameLower()) != 0) {
-      if (const Attribute* const replaced = attributeOf(*self, moved->getOid())) {
+      if (Attribute* const replaced = attributeOf(*self, moved->getOid())) {
         self->attrTable.erase(replaced->getFirstNameLower());
         self->attrOidTable.erase(replaced->getOid());
       }
@@ -167,7 +167,7 @@ bool mergeClasses(State* self, State* source) {
   for (const auto& entry : source->ocTable) {
     ObjectClass* const moved = entry.second;
     if (self->ocTable.count(moved->getFirstNameLower()) != 0) {
-      if (const ObjectClass* const replaced = classOf(*self, moved->getOid())) {
+      if (ObjectClass* const replaced = classOf(*self, moved->getOid())) {
         self->ocTable.erase(replaced->getFirstNameLower());
         self->ocOidTable.erase(replaced->getOid());
       }

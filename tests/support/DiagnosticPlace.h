@@ -9,6 +9,8 @@
 #include <filesystem>
 #include <string>
 
+#include "Machine.h"
+
 namespace support {
 
 constexpr const char* kOpenedFiles[] = {"/tmp/attr.txt", "/tmp/orvattr.txt", "/tmp/objectclass.txt",
@@ -35,13 +37,16 @@ class DiagnosticPlace {
   std::string m_path;
 };
 
-// Gives a file, or a symbolic link, to another user; only root can, and for others it stays theirs.
+// Gives a file, or a symbolic link, to another user where the machine lets this one; else it stays
+// as it is.
 inline void giveToAnotherUser(const char* path) {
-  constexpr uid_t kNobody = 65534;
-  if (::geteuid() == 0) {
-    EXPECT_EQ(0, ::lchown(path, kNobody, kNobody)) << path;
+  if (machineCan(Ability::kGiveFilesAway)) {
+    EXPECT_EQ(0, ::lchown(path, kAnotherUser, kAnotherGroup)) << path;
   }
 }
+
+// The mode of a file that this user cannot open, once it is given away if it can be.
+inline mode_t shutMode() { return machineCan(Ability::kGiveFilesAway) ? 0600 : 0; }
 
 }  // namespace support
 

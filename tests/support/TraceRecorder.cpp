@@ -20,6 +20,11 @@ std::vector<std::string>& recordedMessages() {
   return messages;
 }
 
+std::vector<std::string>& recordedFormats() {
+  static std::vector<std::string> formats;
+  return formats;
+}
+
 std::string hex(unsigned long value) {
   char text[32];
   std::snprintf(text, sizeof text, "0x%lx", value);
@@ -37,7 +42,8 @@ std::string formatted(const char* format, std::va_list arguments) {
   return text;
 }
 
-void recordMessage(const std::string& head, const std::string& text) {
+void recordMessage(const std::string& head, const char* format, const std::string& text) {
+  recordedFormats().emplace_back(format);
   recorded().push_back(head + ": " + text);
   recordedMessages().push_back(text);
 }
@@ -61,14 +67,14 @@ void ldtr_formater_local::debug(unsigned long debugLevel, char const* format, ..
   std::va_list arguments;
   va_start(arguments, format);
   recordMessage("debug " + hex(m_identifier) + " level " + hex(m_level) + " " + hex(debugLevel),
-                formatted(format, arguments));
+                format, formatted(format, arguments));
   va_end(arguments);
 }
 
 void ldtr_formater_global::debug(unsigned long debugLevel, char const* format, ...) {
   std::va_list arguments;
   va_start(arguments, format);
-  recordMessage("debug global level " + hex(m_level) + " " + hex(debugLevel),
+  recordMessage("debug global level " + hex(m_level) + " " + hex(debugLevel), format,
                 formatted(format, arguments));
   va_end(arguments);
 }
@@ -89,7 +95,10 @@ std::vector<std::string> TraceRecorder::records() const { return recorded(); }
 
 std::vector<std::string> TraceRecorder::messages() const { return recordedMessages(); }
 
+std::vector<std::string> TraceRecorder::formats() const { return recordedFormats(); }
+
 void TraceRecorder::clear() {
+  recordedFormats().clear();
   recorded().clear();
   recordedMessages().clear();
 }

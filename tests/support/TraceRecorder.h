@@ -31,6 +31,9 @@ class TraceRecorder {
   // Only the texts of the debug records, with their line ends.
   std::vector<std::string> messages() const;
 
+  // The formats of the same records.
+  std::vector<std::string> formats() const;
+
   void clear();
 };
 

@@ -12,6 +12,7 @@
 #include <fstream>
 
 #include "DiagnosticPlace.h"
+#include "Machine.h"
 #include "SmallFileSystem.h"
 #include "ToolRun.h"
 
@@ -54,8 +55,7 @@ const Row kRows[] = {
     {"Directory", [](const char* place, const std::string&) { EXPECT_EQ(0, ::mkdir(place, 0777)); },
      true},
     {"AnotherUsersFileThatIsShut",
-     [](const char* place, const std::string&) { putFile(place, ::geteuid() == 0 ? 0600 : 0); },
-     true},
+     [](const char* place, const std::string&) { putFile(place, support::shutMode()); }, true},
     {"AnotherUsersFileThatIsOpen",
      [](const char* place, const std::string&) { putFile(place, 0666); }, false},
 };
@@ -116,6 +116,7 @@ class DiagnosticFault : public WholeRun, public testing::WithParamInterface<Row>
 };
 
 TEST_P(DiagnosticFault, ChangesNothing) {
+  SKIP_UNLESS_MACHINE_CAN(kGiveUpPrivileges);
   for (const support::DiagnosticPlace& place : places) {
     GetParam().put(place.path(), folder.file("precious"));
   }
@@ -138,14 +139,17 @@ class NoSpaceForDiagnostics : private FolderElsewhere, public WholeRun {
   ~NoSpaceForDiagnostics() override { ::unsetenv("TMPDIR"); }
 };
 
-// Without the means to mount a file system, only the files themselves have no room.
 TEST_F(NoSpaceForDiagnostics, ChangesNothing) {
+  SKIP_UNLESS_MACHINE_CAN(kMountFileSystems);
+  const support::SmallFileSystem small("/tmp", "mode=1777,size=64k,nr_inodes=1");
+  expectSameRun([] {});
+  EXPECT_FALSE(support::fileExists("/tmp/attr.txt"));
+}
+
+// Neither a place in a directory nor room in a file.
+TEST_F(WholeRun, GoesOnWhenDiagnosticFilesCannotBeChanged) {
+  SKIP_UNLESS_MACHINE_CAN(kFilterSystemCalls);
   expectSameRun([] { failSystemCalls({SYS_ftruncate}, ENOSPC); });
-  if (support::SmallFileSystem::canBeMade()) {
-    const support::SmallFileSystem small("/tmp", "mode=1777,size=64k,nr_inodes=1");
-    expectSameRun([] {});
-    EXPECT_FALSE(support::fileExists("/tmp/attr.txt"));
-  }
 }
 
 }  // namespace

@@ -9,10 +9,16 @@
 #include <filesystem>
 #include <random>
 
+#include "Machine.h"
 #include "ToolRun.h"
 #include "TracedRun.h"
 
 namespace {
+
+constexpr char kInterrupted[] =
+    "schema-migrate: error: interrupted; the output directory was not written\n";
+constexpr char kInterruptedInPlace[] =
+    "schema-migrate: error: interrupted; the output directory is complete and in place\n";
 
 class Fault : public testing::Test {
  protected:
@@ -59,6 +65,7 @@ class Fault : public testing::Test {
       std::filesystem::remove_all(folder.file(name));
       ++count;
     }
+    folder.removePrivateCopies();
     EXPECT_EQ(inputs, folder.snapshot());
     return count;
   }
@@ -76,6 +83,7 @@ class Fault : public testing::Test {
 
   // A run names what the others left, a line each, and is not disturbed.
   void expectLeftoversNamed() {
+    folder.removePrivateCopies();
     const std::vector<std::string> left = leftovers();
     const ToolResult result = folder.migrate();
     EXPECT_EQ(0, result.exitCode);
@@ -117,6 +125,7 @@ class FaultInASmallRun : public Fault {
 // Once before and once behind every change that the run makes to a file system, so that no state
 // that a killed run can leave is missed.
 TEST_F(FaultInASmallRun, KilledAtEveryChange) {
+  SKIP_UNLESS_MACHINE_CAN(kTraceProcesses);
   int changes = 0;
   int withLeftover = 0;
   int withOutput = 0;
@@ -125,9 +134,9 @@ TEST_F(FaultInASmallRun, KilledAtEveryChange) {
       SCOPED_TRACE("change " + std::to_string(changes + 1) + (isBehind ? ", behind" : ", before"));
       int exitCode = 0;
       const pid_t process = folder.startMigrate("old", "out", waitForTracer);
-      isKilled = killAt(process, {changes + 1, isBehind}, &exitCode);
+      isKilled = endAt(process, {changes + 1, isBehind}, SIGKILL, &exitCode);
       const bool isThere = takeWholeOrNothing();
-      EXPECT_EQ(0, exitCode);
+      EXPECT_EQ(isKilled ? 128 + SIGKILL : 0, exitCode);
       EXPECT_TRUE(isKilled || isThere);
       withOutput += isKilled && isThere ? 1 : 0;
       if (!leftovers().empty() && !isThere) {
@@ -144,17 +153,47 @@ TEST_F(FaultInASmallRun, KilledAtEveryChange) {
   RecordProperty("changes", changes);
 }
 
+// At every change, the message says what is there.
+TEST_F(FaultInASmallRun, InterruptedAtEveryChange) {
+  SKIP_UNLESS_MACHINE_CAN(kTraceProcesses);
+  int changes = 0;
+  int inPlace = 0;
+  for (bool isInterrupted = true; isInterrupted; ++changes) {
+    for (const bool isBehind : {false, true}) {
+      SCOPED_TRACE("change " + std::to_string(changes + 1) + (isBehind ? ", behind" : ", before"));
+      int exitCode = 0;
+      const pid_t process = folder.startMigrate("old", "out", waitForTracer);
+      isInterrupted = endAt(process, {changes + 1, isBehind}, SIGTERM, &exitCode);
+      const bool isThere = takeWholeOrNothing();
+      EXPECT_EQ(isInterrupted ? 5 : 0, exitCode);
+      EXPECT_EQ(!isInterrupted ? ""
+                : isThere      ? kInterruptedInPlace
+                               : kInterrupted,
+                folder.complaintsOf("out"));
+      EXPECT_EQ("", folder.privateCopies());
+      EXPECT_EQ(0, removeLeftovers());
+      inPlace += isInterrupted && isThere ? 1 : 0;
+      ASSERT_FALSE(HasFailure());
+    }
+  }
+  // Behind the new name, and around bringing it to the disk.
+  EXPECT_GE(inPlace, 3);
+  RecordProperty("changes", changes);
+}
+
 TEST_F(Fault, InterruptedAtAnyMomentLeavesNothing) {
   for (int round = 0; round < 100; ++round) {
     SCOPED_TRACE("round " + std::to_string(round));
     const int signal = round % 2 == 0 ? SIGTERM : SIGINT;
     const int exitCode = endAtRandom(signal);
-    if (takeWholeOrNothing()) {
-      EXPECT_TRUE(exitCode == 0 || exitCode == 128 + signal) << exitCode;
+    const bool isThere = takeWholeOrNothing();
+    // The signal may come before the program has its handler.
+    if (exitCode == 5) {
+      EXPECT_EQ(isThere ? kInterruptedInPlace : kInterrupted, folder.complaintsOf("out"));
     } else {
-      // The signal may come before the program has its handler.
-      EXPECT_TRUE(exitCode == 5 || exitCode == 128 + signal) << exitCode;
+      EXPECT_EQ(isThere ? 0 : 128 + signal, exitCode);
     }
+    EXPECT_EQ("", folder.privateCopies());
     EXPECT_EQ(0, removeLeftovers());
   }
 }

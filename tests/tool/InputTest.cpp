@@ -10,6 +10,7 @@
 
 #include <filesystem>
 
+#include "Machine.h"
 #include "ToolRun.h"
 
 namespace {
@@ -125,6 +126,25 @@ const Row kRows[] = {
      [](const ToolFolder&) {},
      {"--withdraw", "@/old"},
      "@/old: error: the list of OIDs cannot be read: it is a directory\n"},
+    {"MoreThanIsAllowed",
+     [](const ToolFolder& f) { f.write("old/V3.user.oc", std::string(984, '#')); },
+     {"--max-input", "1K"},
+     "@/old/V3.user.oc: error: with this file the inputs have more than 1 KiB in all; if they are meant to, allow more with --max-input\n"},
+    {"MoreThanIsAllowedWithAList",
+     [](const ToolFolder& f) { f.write("list", std::string(1499, '#') + "\n"); },
+     {"--withdraw", "@/list", "--max-input", "1500"},
+     "@/old/V3.user.at: error: with this file the inputs have more than 1500 bytes in all; if they are meant to, allow more with --max-input\n"},
+    {"MoreThanIsAllowedUnlessGiven",
+     [](const ToolFolder& f) {
+       f.write("new/V3.config.oc", "");
+       ASSERT_EQ(0, ::truncate(f.file("new/V3.config.oc").c_str(), off_t{1} << 30));
+     },
+     {},
+     "@/new/V3.config.oc: error: with this file the inputs have more than 1 GiB in all; if they are meant to, allow more with --max-input\n"},
+    {"NameThatForgesALine",
+     [](const ToolFolder& f) { f.write("list\nout: error: forged \x1b[2J\xc3\xa4", "1.1"); },
+     {"--withdraw", "@/list\nout: error: forged \x1b[2J\xc3\xa4"},
+     "@/list\\x0Aout: error: forged \\x1B[2J\\xC3\\xA4:1: error: no line break behind the last OID, 1.1, which would therefore not count; add a line break at the end of the file\n"},
     {"ListWithoutALastLineBreak",
      [](const ToolFolder& f) { f.write("list", "1.1\n1.2"); },
      {"--exclude-oids", "@/list"},
@@ -151,6 +171,7 @@ INSTANTIATE_TEST_SUITE_P(Rows, Input, testing::ValuesIn(kRows),
 
 // What may not be read: a file of either installation, a directory, a list.
 TEST(InputWithoutPermission, IsRefused) {
+  SKIP_UNLESS_MACHINE_CAN(kGiveUpPrivileges);
   const std::pair<const char*, const char*> kShut[] = {
       {"old/V3.user.at", "@/old/V3.user.at: error: cannot be read: Permission denied\n"},
       {"new/V3.user.oc", "@/new/V3.user.oc: error: cannot be read: Permission denied\n"},
@@ -171,6 +192,17 @@ TEST(InputWithoutPermission, IsRefused) {
     EXPECT_EQ("list new old", folder.names());
     ASSERT_EQ(0, ::chmod(folder.file(name).c_str(), 0700));
   }
+}
+
+// As much as is allowed is read.
+TEST(InputSize, MayBeWhatIsAllowed) {
+  const ToolFolder folder;
+  folder.install("old", {{"V3.user.at", std::string(1000, '\n')}});
+  folder.install("new", {{"V3.user.at", std::string(20, '\n')}});
+  folder.write("list", "1.1\n");
+  EXPECT_EQ(0, folder.migrate({"--withdraw", "@/list", "--max-input", "1k"}).exitCode);
+  std::filesystem::remove_all(folder.file("out"));
+  EXPECT_EQ(3, folder.migrate({"--withdraw", "@/list", "--max-input", "1023"}).exitCode);
 }
 
 // A comment needs no line break behind it, and blanks of every kind separate OIDs.

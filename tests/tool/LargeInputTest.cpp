@@ -74,7 +74,7 @@ TEST_P(LargeInput, TakesLessMemoryThanThreeTimesTheFile) {
   folder.install("new", {{"V3.user.at", "attributetypes=( 1.2 NAME 'b' OBSOLETE )\n"}});
   folder.write("list", "");
   write(row.file);
-  const ToolResult result = folder.migrate({"--exclude-oids", "@/list"}, [] {
+  const ToolResult result = folder.migrate({"--exclude-oids", "@/list", "--max-input", "2G"}, [] {
     // What is freed goes back at once, also in a build with the address sanitizer.
     ::setenv("ASAN_OPTIONS", "quarantine_size_mb=0:thread_local_quarantine_size_kb=0", 1);
     ::alarm(600);

@@ -6,8 +6,11 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <csignal>
 #include <filesystem>
 
+#include "DiagnosticPlace.h"
+#include "Machine.h"
 #include "ToolRun.h"
 
 namespace {
@@ -53,24 +56,43 @@ TEST_F(Output, IsCreatedWithTheModeOfAnyNewDirectory) {
   EXPECT_EQ(8U, folder.contents("out").size());
   EXPECT_EQ(0750U, modeOf("out"));
   EXPECT_EQ(0640U, modeOf("out/V3.user.at"));
-  EXPECT_EQ(0640U, modeOf("out/V3.config.at"));
+}
+
+// What is copied from NEW keeps the mode that it has there, whatever the mask.
+TEST_F(Output, KeepsTheModeOfACopiedFile) {
+  for (const mode_t mode : {0600U, 0444U, 0666U, 0751U}) {
+    ASSERT_EQ(0, ::chmod(folder.file("new/V3.config.at").c_str(), mode));
+    EXPECT_EQ(0, folder.migrate({}, [] { ::umask(027); }).exitCode);
+    EXPECT_EQ(mode, modeOf("out/V3.config.at"));
+    EXPECT_EQ(0640U, modeOf("out/V3.user.at"));
+    std::filesystem::remove_all(folder.file("out"));
+  }
+}
+
+// The group of a directory with this bit goes to what is made in it, and the bit to directories.
+TEST_F(Output, InheritsTheSetgidBitAsAnyNewDirectory) {
+  std::filesystem::create_directory(folder.file("group"));
+  ASSERT_EQ(0, ::chmod(folder.file("group").c_str(), 02755));
+  EXPECT_EQ(0, folder.run(to("@/group/out"), [] { ::umask(022); }).exitCode);
+  EXPECT_EQ(02755U, modeOf("group/out"));
+  EXPECT_EQ(0644U, modeOf("group/out/V3.user.at"));
+  EXPECT_EQ(0, folder.run(to("@/out"), [] { ::umask(022); }).exitCode);
+  EXPECT_EQ(0755U, modeOf("out"));
 }
 
 TEST_F(Output, ReplacesAnEmptyDirectoryAndKeepsItsModeAndOwner) {
   ASSERT_TRUE(std::filesystem::create_directory(folder.file("out")));
   ASSERT_EQ(0, ::chmod(folder.file("out").c_str(), 0710));
-  if (::geteuid() == 0) {
-    ASSERT_EQ(0, ::chown(folder.file("out").c_str(), 12, 34));
-  }
+  support::giveToAnotherUser(folder.file("out").c_str());
+  struct stat before {};
+  ASSERT_EQ(0, ::stat(folder.file("out").c_str(), &before));
   EXPECT_EQ(0, folder.migrate().exitCode);
   EXPECT_EQ(8U, folder.contents("out").size());
   EXPECT_EQ(0710U, modeOf("out"));
   struct stat status {};
   ASSERT_EQ(0, ::stat(folder.file("out").c_str(), &status));
-  if (::geteuid() == 0) {
-    EXPECT_EQ(12U, status.st_uid);
-    EXPECT_EQ(34U, status.st_gid);
-  }
+  EXPECT_EQ(before.st_uid, status.st_uid);
+  EXPECT_EQ(before.st_gid, status.st_gid);
 }
 
 TEST_F(Output, MayBeNamedWithASlashOrFromTheWorkingDirectory) {
@@ -115,6 +137,7 @@ TEST_F(Output, WithoutAPlaceToCreateItIn) {
 }
 
 TEST_F(Output, WithoutPermission) {
+  SKIP_UNLESS_MACHINE_CAN(kGiveUpPrivileges);
   std::filesystem::create_directory(folder.file("shut"));
   ASSERT_EQ(0, ::chmod(folder.file("shut").c_str(), 0555));
   expectFailure(
@@ -124,20 +147,21 @@ TEST_F(Output, WithoutPermission) {
 
 // The library does not notice that a write fails; reading back does.
 TEST_F(Output, ThatDoesNotFitIsRemoved) {
-  std::string many;
+  std::string many = "attributetypes {\n";
   for (int i = 0; i < 2000; ++i) {
-    many += "attributetypes=( 1.3." + std::to_string(i) + " NAME 'n" + std::to_string(i) +
-            "' OBSOLETE )\n";
+    many += "( 1.3." + std::to_string(i) + " NAME 'n" + std::to_string(i) + "' OBSOLETE )\n";
   }
+  many += "}\n";
   folder.install("large", {{"V3.user.at", many}});
   const ToolResult result =
-      folder.run({"migrate", "--from", "@/large", "--to", "@/new", "--out", "@/out"}, [] {
-        const rlimit limit{4096, 4096};
+      folder.run({"migrate", "--from", "@/large", "--to", "@/new", "--out", "@/out"}, [&] {
+        const rlimit limit{many.size(), many.size()};
         ::setrlimit(RLIMIT_FSIZE, &limit);
       });
   EXPECT_EQ(5, result.exitCode);
-  EXPECT_NE(std::string::npos,
-            result.err.find("V3.user.at: error: was not written completely: it ends in line "))
+  EXPECT_NE(
+      std::string::npos,
+      result.err.find("/written/V3.user.at: error: was not written completely: it ends in line "))
       << result.err;
   EXPECT_NE(std::string::npos, result.err.find("is there space left on the file system?\n"))
       << result.err;
@@ -166,6 +190,63 @@ TEST_F(Output, LeftoverOfAKilledRunIsNamedAndLeft) {
       result.err);
   EXPECT_EQ((ToolFolder::Files{{"V3.user.at", "half"}}), folder.contents(".out.partial-abcdef"));
   EXPECT_EQ(8U, folder.contents("out").size());
+}
+
+// Whatever a name holds, a message is one line of printable characters.
+TEST_F(Output, LeftoverCannotForgeALine) {
+  folder.install(".out.partial-a\nout: error: forged\x1b[2J", {});
+  const ToolResult result = folder.migrate();
+  EXPECT_EQ(0, result.exitCode);
+  EXPECT_EQ(
+      "@/.out.partial-a\\x0Aout: error: forged\\x1B[2J: warning: left behind by a run that was killed; it is not used, and can be removed\n",
+      result.err);
+}
+
+TEST_F(Output, NameIsPrintable) {
+  const ToolResult result = folder.run(to("@/out\n\x1b[2J"));
+  EXPECT_EQ(0, result.exitCode);
+  EXPECT_EQ("Written and verified: @/out\\x0A\\x1B[2J\n",
+            result.out.substr(result.out.find("Written")));
+}
+
+// Who starts the program may have told the system to forget processes that end.
+TEST_F(Output, DoesNotDependOnHowProcessesEnd) {
+  const ToolResult result = folder.migrate({}, [] { ::signal(SIGCHLD, SIG_IGN); });
+  EXPECT_EQ(0, result.exitCode);
+  EXPECT_EQ("", result.err);
+  EXPECT_EQ(8U, folder.contents("out").size());
+}
+
+// A warning that nobody gets to read stops the run: of a leftover, of a file that is not read, of a
+// definition that is read oddly, and of one that gets lost.
+TEST_F(Output, WarningThatCannotBePrintedStopsTheRun) {
+  const auto fullError = [] {
+    if (::freopen("/dev/full", "w", stderr) == nullptr) {
+      ::_exit(125);
+    }
+  };
+  EXPECT_EQ(0, folder.migrate({}, fullError).exitCode);
+  std::filesystem::remove_all(folder.file("out"));
+  const std::pair<const char*, const char*> kCauses[] = {
+      {".out.partial-abcdef", ""},
+      {"old/V3.other", "x"},
+      {"old/V3.user.oc", "objectclasses=( 1.4 NAME 'c' ABSTRACT X-ORIGIN 'here' )\n"},
+      {"old/V3.orv.at", "ORVAttributetypes=( 1.9 LENGTH 3 )\n"},
+  };
+  for (const auto& [name, text] : kCauses) {
+    SCOPED_TRACE(name);
+    if (*text == '\0') {
+      folder.install(name, {});
+    } else {
+      folder.write(name, text);
+    }
+    const std::string before = folder.snapshot();
+    EXPECT_EQ(0, folder.migrate().exitCode);
+    std::filesystem::remove_all(folder.file("out"));
+    EXPECT_EQ(5, folder.migrate({}, fullError).exitCode);
+    EXPECT_EQ(before, folder.snapshot());
+    std::filesystem::remove_all(folder.file(name));
+  }
 }
 
 TEST_F(Output, ReportThatCannotBePrintedStopsTheRun) {
@@ -223,6 +304,9 @@ const Row kRows[] = {
     {"UsageThatIsANumber", "USAGE '12'"},
     {"ValueThatNeverEnds", "EQUALITY 'a COLLECTIVE b'"},
     {"ValueThatBeginsAnother", "SYNTAX 'a attributetypes b'"},
+    {"ValueWithARemark", "EQUALITY '1.2 # y'"},
+    {"ValueThatCloses", "EQUALITY 'a ) b'"},
+    {"ValueThatOpensABlock", "EQUALITY 'a ) attributetypes { ( 3.3'"},
 };
 
 class Unwritable : public testing::TestWithParam<Row> {};
@@ -238,6 +322,26 @@ TEST_P(Unwritable, DefinitionIsFoundOutAndNothingIsLeft) {
       "@/old/V3.user.at:2: error: attribute type a (1.1) would not be read again as it is written: a value in quotes that is neither a name nor a description, an empty value and a second SUP do not survive; mend the definition, or list 1.1 in a file for --exclude-oids if it is OLD's\n",
       result.err);
   EXPECT_EQ("new old", folder.names());
+}
+
+// The culprit is told from the others in its file, wherever it stands among them, and whichever
+// installation they are of.
+TEST_P(Unwritable, DefinitionIsToldFromTheOthers) {
+  for (const char* const oid : {"1.0", "1.2", "1.4", "9.9"}) {
+    SCOPED_TRACE(oid);
+    const ToolFolder folder;
+    folder.install("old", {{"V3.user.at",
+                            "attributetypes=( 1.1 NAME 'first' OBSOLETE )\n"
+                            "attributetypes=( " +
+                                std::string(oid) + " NAME 'a' " + GetParam().definition + " )\n"}});
+    folder.install("new", {{"V3.user.at",
+                            "attributetypes=( 1.3 NAME 'b' OBSOLETE )\n"
+                            "attributetypes=( 1.5 NAME 'last' OBSOLETE )\n"}});
+    const ToolResult result = folder.migrate({}, [] { ::alarm(20); });
+    EXPECT_EQ(5, result.exitCode);
+    EXPECT_EQ("@/old/V3.user.at:2: error: attribute type a (" + std::string(oid) + ")",
+              result.err.substr(0, result.err.find(" would not be read again")));
+  }
 }
 
 INSTANTIATE_TEST_SUITE_P(Rows, Unwritable, testing::ValuesIn(kRows),

@@ -8,11 +8,10 @@
 #include <filesystem>
 #include <random>
 
-#include "Inventory.h"
 #include "Messages.h"
 #include "Migration.h"
-#include "OidList.h"
 #include "SeparateProcess.h"
+#include "StagedRun.h"
 #include "ToolRun.h"
 #include "Verification.h"
 
@@ -99,15 +98,10 @@ std::size_t occurrencesOf(const std::string& part, const std::string& text) {
 
 // Works one pair out, makes the migration, and compares the two. Returns what is wrong.
 std::string problemOf(const ToolFolder& folder, Counts* counts) {
-  OidLists lists;
-  readOidList(folder.file("exclude"), &lists.excluded);
-  readOidList(folder.file("withdraw"), &lists.withdrawn);
-  std::string warnings;
-  const Inventory oldOne("OLD", folder.file("old"), &warnings);
-  const Inventory newOne("NEW", folder.file("new"), &warnings);
-  const Plan plan(oldOne, newOne, lists);
-  const Installations installations{
-      oldOne, newOne, {folder.file("exclude")}, folder.file("withdraw")};
+  StagedRun run(folder);
+  const Inventory& oldOne = run.oldOne;
+  const Plan plan(oldOne, run.newOne, run.lists);
+  const Installations installations{oldOne, run.newOne, {run.exclude}, run.withdraw};
   const std::size_t lacking = occurrencesOf(": NEW lacks it", plan.refusals());
   ++counts->runs;
   counts->refused += plan.refusalCount() != 0 ? 1 : 0;
@@ -120,8 +114,9 @@ std::string problemOf(const ToolFolder& folder, Counts* counts) {
     if (lacking != 0) {
       return "the library makes a merge that was refused:\n" + plan.refusals();
     }
-    migration.write(folder.file("out"));
-    verifyOutput(folder.file("out"), plan, newOne);
+    const OwnDirectory& written = run.place.makeDirectory("written");
+    migration.write(run.place.pathOf("written"));
+    verifyWritten(written.directory(), run.place.pathOf("written"), plan);
   } catch (const Failure& failure) {
     ++counts->refusedByTheLibrary;
     return lacking != 0 && failure.exitCode() == kRefused ? "" : failure.what();
@@ -132,18 +127,11 @@ std::string problemOf(const ToolFolder& folder, Counts* counts) {
 }
 
 void install(const ToolFolder& folder, PairMaker* maker) {
-  for (const char* const name : {"old", "new", "out"}) {
+  for (const char* const name : {"old", "new"}) {
     std::filesystem::remove_all(folder.file(name));
   }
-  const ToolFolder::Files newOne = maker->installation();
+  folder.install("new", maker->installation());
   folder.install("old", maker->installation());
-  folder.install("new", newOne);
-  folder.install("out", {});
-  for (const char* const name : {"V3.config.at", "V3.config.oc"}) {
-    if (newOne.count(name) != 0) {
-      folder.write("out/" + std::string(name), newOne.at(name));
-    }
-  }
   folder.write("exclude", maker->list());
   folder.write("withdraw", maker->list());
 }

@@ -130,4 +130,17 @@ TEST(RefusalOfExtension, IsLiftedByTheLineInTheVendorsFile) {
   EXPECT_NE(std::string::npos, folder.contents("out")["V3.user.at"].find("LENGTH 3"));
 }
 
+// An OID list holds words: the OID "s badge" is none.
+TEST(RefusalAdvice, NoAdviceToListWhatNoListCanHold) {
+  ToolFolder folder;
+  folder.install("old",
+                 {{"V3.user.oc", "objectclasses=( 1.2 NAME 'a' ABSTRACT X-DESC 's badge' )\n"}});
+  folder.install("new", {{"V3.user.oc", "objectclasses=( 1.1 NAME 'a' ABSTRACT )\n"}});
+  const ToolResult result = folder.migrate();
+  EXPECT_EQ(4, result.exitCode);
+  EXPECT_NE(std::string::npos, result.err.find("give it NEW's OID or a first name of its own\n"))
+      << result.err;
+  EXPECT_EQ(std::string::npos, result.err.find("or list ")) << result.err;
+}
+
 }  // namespace

@@ -2,10 +2,6 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
-#include <linux/capability.h>
-#include <linux/filter.h>
-#include <linux/seccomp.h>
-#include <sys/prctl.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
@@ -13,12 +9,13 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <cstdint>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <set>
 #include <sstream>
+
+#include "Privileges.h"
 
 namespace {
 
@@ -36,6 +33,24 @@ std::string withoutTimeStamp(const std::string& text) {
     return text;
   }
   return kHeader + text.substr(text.find('\n') + 1);
+}
+
+constexpr char kPrivate[] = ".std-private";
+
+std::string namesIn(const std::string& path, const std::string& left) {
+  std::vector<std::string> names;
+  for (const auto& entry : std::filesystem::directory_iterator(path)) {
+    const std::string name = entry.path().filename().string();
+    if (left.empty() || name.compare(0, left.size(), left) != 0) {
+      names.push_back(name);
+    }
+  }
+  std::sort(names.begin(), names.end());
+  std::string text;
+  for (const std::string& name : names) {
+    text += (text.empty() ? "" : " ") + name;
+  }
+  return text;
 }
 
 void redirect(const std::string& path, int descriptor) {
@@ -60,27 +75,14 @@ std::string described(const std::string& path) {
   return text.str();
 }
 
-// The capabilities that let root pass over permissions are not got back by starting a program.
 void obeyPermissions() {
-  if (::geteuid() == 0 && (::prctl(PR_CAPBSET_DROP, CAP_DAC_OVERRIDE) != 0 ||
-                           ::prctl(PR_CAPBSET_DROP, CAP_DAC_READ_SEARCH) != 0)) {
+  if (!support::giveUpPrivileges()) {
     ::_exit(125);
   }
 }
 
 void failSystemCalls(const std::vector<int>& calls, int error) {
-  std::vector<sock_filter> filter = {
-      BPF_STMT(BPF_LD | BPF_W | BPF_ABS, offsetof(seccomp_data, nr)),
-  };
-  for (const int call : calls) {
-    filter.push_back(BPF_JUMP(BPF_JMP | BPF_JEQ | BPF_K, static_cast<std::uint32_t>(call), 0, 1));
-    filter.push_back(
-        BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ERRNO | static_cast<std::uint32_t>(error)));
-  }
-  filter.push_back(BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ALLOW));
-  const sock_fprog program{static_cast<unsigned short>(filter.size()), filter.data()};
-  if (::prctl(PR_SET_NO_NEW_PRIVS, 1, 0, 0, 0) != 0 ||
-      ::prctl(PR_SET_SECCOMP, SECCOMP_MODE_FILTER, &program) != 0) {
+  if (!support::filterSystemCalls(calls, error)) {
     ::_exit(125);
   }
 }
@@ -94,6 +96,8 @@ int exitCodeOf(pid_t process, std::size_t* peakBytes) {
   }
   return WIFSIGNALED(status) ? 128 + WTERMSIG(status) : WEXITSTATUS(status);
 }
+
+ToolFolder::ToolFolder() { std::filesystem::create_directory(file(kPrivate)); }
 
 void ToolFolder::write(const std::string& name, const std::string& text) const {
   m_folder.write(name, text);
@@ -120,6 +124,7 @@ pid_t ToolFolder::start(const std::vector<std::string>& arguments, const std::st
   const pid_t child = ::fork();
   if (child == 0) {
     ::setenv("LSAN_OPTIONS", "suppressions=" LEAK_SUPPRESSIONS ":print_suppressions=0", 1);
+    ::setenv("TMPDIR", file(kPrivate).c_str(), 1);
     redirect(out, STDOUT_FILENO);
     redirect(err, STDERR_FILENO);
     if (prepare) {
@@ -137,6 +142,9 @@ ToolResult ToolFolder::run(const std::vector<std::string>& arguments,
   const std::string err = file(".stderr");
   ToolResult result;
   result.exitCode = exitCodeOf(start(arguments, out, err, prepare), &result.peakBytes);
+  if (result.exitCode < 128) {
+    EXPECT_EQ("", privateCopies());
+  }
   result.out = withoutPath(support::readWholeFile(out));
   result.err = withoutPath(support::readWholeFile(err));
   return result;
@@ -150,18 +158,23 @@ ToolResult ToolFolder::migrate(const std::vector<std::string>& more,
   return run(arguments, prepare);
 }
 
+std::string ToolFolder::captured(const std::string& stream, std::string out) const {
+  std::replace(out.begin(), out.end(), '/', '-');
+  return file(".std-" + stream + "-" + out);
+}
+
 pid_t ToolFolder::startMigrate(const std::string& old, const std::string& out,
                                const std::function<void()>& prepare) const {
   return start({"migrate", "--from", "@/" + old, "--to", "@/new", "--out", "@/" + out},
-               file(".std-out-" + out), file(".std-err-" + out), prepare);
+               captured("out", out), captured("err", out), prepare);
 }
 
 std::string ToolFolder::printedBy(const std::string& out) const {
-  return withoutPath(support::readWholeFile(file(".std-out-" + out)));
+  return withoutPath(support::readWholeFile(captured("out", out)));
 }
 
 std::string ToolFolder::complaintsOf(const std::string& out) const {
-  return withoutPath(support::readWholeFile(file(".std-err-" + out)));
+  return withoutPath(support::readWholeFile(captured("err", out)));
 }
 
 ToolFolder::Files ToolFolder::contents(const std::string& name) const {
@@ -176,20 +189,13 @@ ToolFolder::Files ToolFolder::contents(const std::string& name) const {
   return files;
 }
 
-std::string ToolFolder::names() const {
-  std::vector<std::string> names;
-  for (const auto& entry : std::filesystem::directory_iterator(path())) {
-    const std::string name = entry.path().filename().string();
-    if (name.compare(0, 4, ".std") != 0) {
-      names.push_back(name);
-    }
-  }
-  std::sort(names.begin(), names.end());
-  std::string text;
-  for (const std::string& name : names) {
-    text += (text.empty() ? "" : " ") + name;
-  }
-  return text;
+std::string ToolFolder::names() const { return namesIn(path(), ".std"); }
+
+std::string ToolFolder::privateCopies() const { return namesIn(file(kPrivate), ""); }
+
+void ToolFolder::removePrivateCopies() const {
+  std::filesystem::remove_all(file(kPrivate));
+  std::filesystem::create_directory(file(kPrivate));
 }
 
 std::string ToolFolder::snapshot() const {

@@ -27,6 +27,8 @@ class ToolFolder {
   // The files of an installation, by name.
   using Files = std::map<std::string, std::string>;
 
+  ToolFolder();
+
   const std::string& path() const { return m_folder.path(); }
   std::string file(const std::string& name) const { return m_folder.file(name); }
   void write(const std::string& name, const std::string& text) const;
@@ -61,12 +63,19 @@ class ToolFolder {
   // Everything in the folder as described() tells, that of captured output left out.
   std::string snapshot() const;
 
+  // The names of what lies where the runs have their private copies, blank-separated. A run that
+  // comes to its end must leave nothing.
+  std::string privateCopies() const;
+  void removePrivateCopies() const;
+
   std::string withoutPath(std::string text) const;
   std::string withPath(std::string text) const;
 
  private:
   pid_t start(const std::vector<std::string>& arguments, const std::string& out,
               const std::string& err, const std::function<void()>& prepare) const;
+
+  std::string captured(const std::string& stream, std::string out) const;
 
   std::string m_program = SCHEMA_MIGRATE;
   support::TemporaryDirectory m_folder;

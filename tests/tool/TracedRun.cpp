@@ -72,23 +72,27 @@ void waitForTracer() {
   }
 }
 
-bool killAt(pid_t process, const Moment& moment, int* exitCode) {
+bool endAt(pid_t process, const Moment& moment, int signal, int* exitCode) {
   int status = 0;
   EXPECT_EQ(process, ::waitpid(process, &status, 0));
   EXPECT_TRUE(WIFSTOPPED(status)) << "the program is not traced";
   ::ptrace(PTRACE_SETOPTIONS, process, nullptr, PTRACE_O_TRACESYSGOOD | PTRACE_O_EXITKILL);
   Changes changes;
-  int signal = 0;
-  while (::ptrace(PTRACE_SYSCALL, process, nullptr, signal) == 0 &&
-         ::waitpid(process, &status, 0) == process && WIFSTOPPED(status)) {
+  bool isSent = false;
+  int passedOn = 0;
+  for (;;) {
+    // Fails when the process was killed, and there is its end to be waited for.
+    ::ptrace(PTRACE_SYSCALL, process, nullptr, passedOn);
+    if (::waitpid(process, &status, 0) != process || !WIFSTOPPED(status)) {
+      break;
+    }
     const bool isAtCall = WSTOPSIG(status) == kCallStop;
-    signal = isAtCall ? 0 : WSTOPSIG(status);
-    if (isAtCall && changes.isReached(process, moment)) {
-      ::kill(process, SIGKILL);
-      EXPECT_EQ(process, ::waitpid(process, &status, 0));
-      return true;
+    passedOn = isAtCall ? 0 : WSTOPSIG(status);
+    if (isAtCall && !isSent && changes.isReached(process, moment)) {
+      ::kill(process, signal);
+      isSent = true;
     }
   }
   *exitCode = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
-  return false;
+  return isSent;
 }

@@ -1,4 +1,4 @@
-// A run of schema-migrate that is killed at a chosen system call.
+// A run of schema-migrate that gets a signal at a chosen system call.
 
 #ifndef LIBSCHEMA_TESTS_TRACED_RUN_H
 #define LIBSCHEMA_TESTS_TRACED_RUN_H
@@ -12,11 +12,11 @@ struct Moment {
   bool isBehind;  // when the call has taken effect, or before it does
 };
 
-// To be called in `prepare`, for killAt() to take the program over.
+// To be called in `prepare`, for endAt() to take the program over.
 void waitForTracer();
 
-// Lets the program go on until then, and ends it with SIGKILL; returns false when it came to its
-// end before, with its exit code in *exitCode.
-bool killAt(pid_t process, const Moment& moment, int* exitCode);
+// Lets the program go on until then, sends it `signal`, and waits for its end. Returns false when
+// it came to its end before. Its exit code, or 128 and the signal that ended it, is in *exitCode.
+bool endAt(pid_t process, const Moment& moment, int signal, int* exitCode);
 
 #endif  // LIBSCHEMA_TESTS_TRACED_RUN_H

@@ -2,6 +2,7 @@
 // writes to the file named in HOST_RECORDS how many there were of each kind.
 
 #include <cstdarg>
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 

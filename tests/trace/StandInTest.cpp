@@ -98,6 +98,12 @@ TEST_P(StandIn, IsSilentWithoutTheVariable) {
   EXPECT_EQ(output.err, "");
 }
 
+TEST_P(StandIn, WritesTheRestWhenOnlyAPieceWasTaken) {
+  const Output output = run("Pieces", "LIBSCHEMA_TRACE=4096");
+  EXPECT_EQ(output.out, "read 0\n");
+  EXPECT_EQ(output.err, kEntriesAndExits);
+}
+
 struct MaskRow {
   const char* value;
   const char* records;

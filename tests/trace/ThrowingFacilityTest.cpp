@@ -8,12 +8,15 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <functional>
 #include <stdexcept>
 #include <string>
 #include <vector>
 
 #include "Files.h"
+#include "SchemaLexan.h"
 #include "SchemaManager.h"
+#include "UnfreedDefinitions.h"
 #include "ldtr.h"
 #include "timestamp.h"
 
@@ -22,9 +25,10 @@ ldtr_function_global ldtr_fun;
 
 namespace {
 
-// What the facility was given, and the record that it throws at.
+// What the facility was given, the record that it throws at, and who looks on at each record.
 std::vector<std::string> received;
 std::string refused;
+std::function<void(const std::string&)> onlooker;
 
 std::string hex(unsigned long value) {
   char text[32];
@@ -34,6 +38,9 @@ std::string hex(unsigned long value) {
 
 void receive(const std::string& record) {
   received.push_back(record);
+  if (onlooker) {
+    onlooker(record);
+  }
   if (!refused.empty() && record.find(refused) != std::string::npos) {
     throw std::runtime_error(record);
   }
@@ -189,6 +196,42 @@ TEST_F(ThrowingFacility, WhileAFileIsRead) {
   std::setlocale(LC_ALL, "C");
 }
 
+// Before the switch the locale stays what it is; behind it, it becomes the environment's.
+TEST_F(ThrowingFacility, WhileAnAnalyserIsConstructed) {
+  directory.write("V3.user.at", "");
+  ::setenv("LC_ALL", "C.UTF-8", 1);
+  const struct {
+    const char* place;
+    const char* locale;
+  } rows[] = {{"SchemaLexan: current locale", "C"},
+              {"SchemaLexan: changing locale", "C"},
+              {"SchemaLexan: locale settings on the system after", "C.UTF-8"}};
+  for (const auto& row : rows) {
+    std::setlocale(LC_ALL, "C");
+    exitsOf(row.place, [&] { SchemaLexan(directory.path(), "V3.user.at"); });
+    EXPECT_STREQ(std::setlocale(LC_ALL, nullptr), row.locale) << row.place;
+  }
+  ::unsetenv("LC_ALL");
+  std::setlocale(LC_ALL, "C");
+}
+
+// A destructor lets no exception out.
+TEST_F(ThrowingFacility, WhileAnAnalyserIsDestroyed) {
+  directory.write("V3.user.at", "");
+  ::setenv("LC_ALL", "C.UTF-8", 1);
+  for (const char* const place : {"~SchemaLexan", "lexan: locale settings after"}) {
+    {
+      const SchemaLexan lexer(directory.path(), "V3.user.at");
+      refused = place;
+      trcEvents = 0x04000000;
+    }
+    reset();
+    EXPECT_STREQ(std::setlocale(LC_ALL, nullptr), "C.UTF-8") << place;
+  }
+  ::unsetenv("LC_ALL");
+  std::setlocale(LC_ALL, "C");
+}
+
 TEST_F(ThrowingFacility, AtTheRecordsOfAFailedRead) {
   directory.write("V3.user.at", "attributetypes=( 1.1 DESC 'd'\n");
   for (const char* const place : {"debug readFile: There was", "debug readFile: (1)",
@@ -197,6 +240,44 @@ TEST_F(ThrowingFacility, AtTheRecordsOfAFailedRead) {
     const std::string exits = exitsOf(place, [&] { fresh.readFile("V3.user.at"); });
     EXPECT_NE(exits.find("exit 0x53051000 code 0\n"), std::string::npos) << place;
   }
+}
+
+// What was read before an exception passed is there, and is written, as after any other failure.
+TEST_F(ThrowingFacility, WhatWasReadBeforeStays) {
+  const std::string text = std::string(kDefinitions) +
+                           "attributetypes=( 1.2 NAME 'a' DESC 'd' )\n" +
+                           "attributetypes=( 1.3 NAME 'b' DESC 'd' )\nobjectclasses=( 2.2\n";
+  directory.write("V3.user.at", text);
+  // Of 1.1 and 1.2, which share a name, the second is held by its OID alone.
+  const support::UnfreedDefinitions unfreed;
+  for (const char* const place : {"debug readFile: There was", "debug readFile: (1)"}) {
+    SchemaManager fresh(directory.path());
+    exitsOf(place, [&] { fresh.readFile("V3.user.at"); });
+    EXPECT_EQ(fresh.getAttr("a").getOid(), "1.1") << place;
+    EXPECT_EQ(fresh.getAttr("1.2").getFirstName(), "a") << place;
+    EXPECT_EQ(fresh.getAttr("b").getOid(), "1.3") << place;
+    EXPECT_EQ(fresh.getORVAttr("1.1").getOid(), "1.1") << place;
+    EXPECT_EQ(fresh.getObjClass("o").getOid(), "2.1") << place;
+    EXPECT_EQ(fresh.delOidFromFileSet("1.3"), 0) << place;
+  }
+}
+
+// Who looks on at the records of a failure finds what was read before it.
+TEST_F(ThrowingFacility, WhatWasReadBeforeAFailureIsThereAtItsFirstRecord) {
+  directory.write("V3.user.at", std::string(kDefinitions) + "attributetypes=( 1.2\n");
+  std::string found;
+  onlooker = [&](const std::string& record) {
+    if (record.find("debug readFile: There was") != std::string::npos) {
+      onlooker = nullptr;
+      found = manager.getAttr("a").getOid() + " " + manager.getORVAttr("1.1").getOid() + " " +
+              manager.getObjClass("2.1").getFirstName() + " " +
+              std::to_string(manager.delOidFromFileSet("2.1"));
+    }
+  };
+  trcEvents = 0x04000000;
+  EXPECT_EQ(manager.readFile("V3.user.at"), 1);
+  reset();
+  EXPECT_EQ(found, "1.1 1.1 o 0");
 }
 
 TEST_F(ThrowingFacility, WhileAFileIsWritten) {

@@ -348,12 +348,12 @@ TEST(UntracedFunctions, LeaveNoRecords) {
   char character = ' ';
   TraceRecorder recorder(support::kAllEvents & ~support::kDebugEvents);
 
-  const Attribute attribute(world.attribute);
-  const ORVAttribute extension(world.extension);
-  const ObjectClass objectClass(world.objectClass);
-  for (const ORVSchema* definition :
-       {static_cast<const ORVSchema*>(&attribute), static_cast<const ORVSchema*>(&extension),
-        static_cast<const ORVSchema*>(&objectClass)}) {
+  Attribute attribute(world.attribute);
+  ORVAttribute extension(world.extension);
+  ObjectClass objectClass(world.objectClass);
+  for (ORVSchema* definition :
+       {static_cast<ORVSchema*>(&attribute), static_cast<ORVSchema*>(&extension),
+        static_cast<ORVSchema*>(&objectClass)}) {
     definition->getOid();
     definition->getDescription();
     definition->getSuperior();

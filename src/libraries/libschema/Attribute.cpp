@@ -1,10 +1,11 @@
 #include "Attribute.h"
 
-#include <iostream>
+#include <ostream>
 #include <utility>
 
 #include "CaseFolding.h"
 #include "ClauseShapes.h"
+#include "StandardOutput.h"
 #include "TracePoints.h"
 
 using libschema::isOneOf;
@@ -13,11 +14,11 @@ using libschema::readValue;
 namespace {
 
 // The values of USAGE. A definition without the clause has the first; what a file gives is not
-// checked against them.
-const std::string userApps = "userApplications";
-[[maybe_unused]] const std::string dirOp = "directoryOperation";
-[[maybe_unused]] const std::string disOp = "distributedOperation";
-[[maybe_unused]] const std::string dsaOp = "dSAOperation";
+// checked against them. They are there before any static object is constructed.
+constexpr char userApps[] = "userApplications";
+[[maybe_unused]] constexpr char dirOp[] = "directoryOperation";
+[[maybe_unused]] constexpr char disOp[] = "distributedOperation";
+[[maybe_unused]] constexpr char dsaOp[] = "dSAOperation";
 
 // What ends an attribute type: the end of the input and the keyword of any definition are failures.
 bool endsDefinition(int token) {
@@ -45,7 +46,7 @@ int readNames(SchemaLexan* lexer, libschema::DistinctNames* names) {
     }
     token = lexer->lexan();
     if (token == TOKEN_END) {
-      libschema::spin();
+      libschema::spin(lexer);
     }
   } while (!endsNames(token));
   return token;
@@ -121,7 +122,7 @@ int Attribute::parseClause(SchemaLexan* lexer, int token) {
       // No further token is read: the loop meets COLLECTIVE again, for ever.
       // AttributeParse.CollectiveNeverCompletes.
       isCollective = true;
-      libschema::spin();
+      libschema::spin(lexer);
       return token;
     default:
       return lexer->lexan();
@@ -172,10 +173,12 @@ void Attribute::dump() {
           syntax + "\nordering --> " + ordering + "\nsubstr --> " + substr + "\nsuperior --> ";
   libschema::appendSpaced(superiors, &text);
   text += "\nusage --> " + usage + "\n";
-  std::cout << text << std::flush;
+  libschema::standardOutput() << text << std::flush;
 }
 
-int Attribute::attrsEqual(const Attribute& other) const {
+int Attribute::attrsEqual(const Attribute& other) { return isEqualTo(other) ? 1 : 0; }
+
+bool Attribute::isEqualTo(const Attribute& other) const {
   tracepoint::AttributeAttrsEqual trace;
   const bool isEqual =
       OID == other.OID && description == other.description && equality == other.equality &&
@@ -185,23 +188,32 @@ int Attribute::attrsEqual(const Attribute& other) const {
       isUserModifiable == other.isUserModifiable && names.size() == other.names.size() &&
       superiors.size() == other.superiors.size() && libschema::hasPartners(names, other.names) &&
       libschema::hasPartners(superiors, other.superiors);
-  return trace.status(isEqual ? 1 : 0);
+  return trace.status(isEqual ? 1 : 0) != 0;
 }
 
-std::string Attribute::getOid() const { return OID; }
+std::string Attribute::getOid() { return OID; }
 
-std::string Attribute::getDescription() const { return description; }
+std::string Attribute::getDescription() { return description; }
 
-std::vector<std::string> Attribute::getSuperior() const { return superiors; }
+std::vector<std::string> Attribute::getSuperior() { return superiors; }
 
-std::string Attribute::getFirstName() const {
-  return names.empty() ? std::string() : names.front();
+std::string Attribute::getFirstName() { return names.empty() ? std::string() : names.front(); }
+
+std::vector<std::string> Attribute::getNames() { return names; }
+
+std::string Attribute::getFirstNameLower() { return firstNameLower(); }
+
+std::string Attribute::getSyntaxOid() const { return syntax.substr(0, syntax.find('{')); }
+
+std::string Attribute::getSyntaxLength() const {
+  const std::size_t brace = syntax.find('{');
+  return brace == std::string::npos || syntax.back() != '}'
+             ? std::string()
+             : syntax.substr(brace + 1, syntax.size() - brace - 2);
 }
 
-std::vector<std::string> Attribute::getNames() const { return names; }
+bool Attribute::getSingleValue() const { return singleValue == KEY_SINGLE_VALUE; }
 
-std::string Attribute::getFirstNameLower() const { return libschema::lowered(getFirstName()); }
+std::string Attribute::convert(std::string s) { return libschema::lowered(std::move(s)); }
 
-std::string Attribute::convert(std::string s) const { return libschema::lowered(std::move(s)); }
-
-std::string Attribute::getOidAndName() const { return libschema::reportEntry(OID, names); }
+std::string Attribute::getOidAndName() { return libschema::reportEntry(OID, names); }

@@ -31,20 +31,44 @@ class Attribute : public ORVSchema {
   // Returns 1 when both define the same, else 0: names and superiors in any order and letter case,
   // everything else exactly. Each name and superior of this definition must be among those of
   // `other`, with equal counts; the test is not made from the other side.
-  int attrsEqual(const Attribute& other) const;
+  int attrsEqual(const Attribute& other);
 
-  std::string getOid() const override;
-  std::string getDescription() const override;
-  std::vector<std::string> getSuperior() const override;
-  std::string getFirstName() const override;
-  std::vector<std::string> getNames() const override;
-  std::string getFirstNameLower() const override;
+  // The same, with the same trace records, of a definition that is constant.
+  bool isEqualTo(const Attribute& other) const;
+
+  std::string getOid() override;
+  std::string getDescription() override;
+  std::vector<std::string> getSuperior() override;
+  std::string getFirstName() override;
+  std::vector<std::string> getNames() override;
+  std::string getFirstNameLower() override;
 
   // Returns `s` with every character passed through tolower.
-  std::string convert(std::string s) const;
+  std::string convert(std::string s);
 
   // Returns the entry of a collision report: "OID --> …\nName --> …\n\n", the names joined by ", ".
-  std::string getOidAndName() const;
+  std::string getOidAndName();
+
+  // The matching rules, by name or OID as read; empty without the clause. Valid as long as the
+  // definition is there and unchanged, like every text returned by reference here.
+  const std::string& getEquality() const { return equality; }
+  const std::string& getOrdering() const { return ordering; }
+  const std::string& getSubstr() const { return substr; }
+
+  // SYNTAX as read, with its length; then the part before "{", and the number in braces as text,
+  // empty without one.
+  const std::string& getSyntax() const { return syntax; }
+  std::string getSyntaxOid() const;
+  std::string getSyntaxLength() const;
+
+  // USAGE as read; "userApplications" without the clause.
+  const std::string& getUsage() const { return usage; }
+
+  // The flags. An attribute type is modifiable by users unless NO-USER-MODIFICATION says otherwise.
+  bool getObsolete() const { return isObsolete; }
+  bool getSingleValue() const;
+  bool getCollective() const { return isCollective; }
+  bool getUserModification() const { return isUserModifiable; }
 
   // Appends the line that dump(std::ofstream&) writes, with that operation's trace records. For a
   // caller that writes many definitions through a buffer of its own.

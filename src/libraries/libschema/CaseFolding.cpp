@@ -8,7 +8,7 @@ namespace libschema {
 namespace {
 
 // tolower itself is asked only about what some locale may change: never a digit or one of a to z.
-char lower(char c) {
+char lowered(char c) {
   if ((c >= 'a' && c <= 'z') || (c >= '0' && c <= '9')) {
     return c;
   }
@@ -18,19 +18,23 @@ char lower(char c) {
 bool equalLowered(const std::string& left, const std::string& right) {
   return left.size() == right.size() &&
          std::equal(left.begin(), left.end(), right.begin(),
-                    [](char a, char b) { return a == b || lower(a) == lower(b); });
+                    [](char a, char b) { return a == b || lowered(a) == lowered(b); });
 }
 
 }  // namespace
 
 std::string lowered(std::string text) {
-  std::transform(text.begin(), text.end(), text.begin(), lower);
+  lower(text.data(), text.size());
   return text;
+}
+
+void lower(char* text, std::size_t size) {
+  std::transform(text, text + size, text, [](char c) { return lowered(c); });
 }
 
 LowerCase::LowerCase() : m_forms() {
   for (std::size_t c = 0; c < m_forms.size(); ++c) {
-    m_forms[c] = lower(static_cast<char>(c));
+    m_forms[c] = lowered(static_cast<char>(c));
   }
 }
 

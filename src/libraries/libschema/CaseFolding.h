@@ -7,6 +7,7 @@
 #include <array>
 #include <cstddef>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace libschema {
@@ -14,13 +15,16 @@ namespace libschema {
 // Returns `text` with every character passed through tolower.
 std::string lowered(std::string text);
 
+// The same in place.
+void lower(char* text, std::size_t size);
+
 // What tolower makes of each character, in the locale that is in force at the construction.
 class LowerCase {
  public:
   LowerCase();
 
   // True when lowered(text) == folded and lowered(folded) == folded.
-  bool isFormOf(const std::string& folded, const std::string& text) const {
+  bool isFormOf(std::string_view folded, std::string_view text) const {
     if (folded.size() != text.size()) {
       return false;
     }

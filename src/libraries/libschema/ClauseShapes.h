@@ -43,9 +43,9 @@ int readValue(SchemaLexan* lexer, TokenSet accepted, std::string* value);
 // those.
 int readList(SchemaLexan* lexer, std::vector<std::string>* list);
 
-// One turn of a loop that is never left. It reads a volatile object, so that an optimizer may not
-// assume that the loop ends.
-void spin();
+// One turn of a loop that is left only over a PlacedLexan. It reads a volatile object, so that an
+// optimizer may not assume that the loop ends.
+void spin(const SchemaLexan* lexer);
 
 // Adds names to a list unless an equal one is there. Looks up in order once the list is long, so
 // that K names cost no K * K comparisons.

@@ -1,19 +1,20 @@
 #include "ORVAttribute.h"
 
-#include <iostream>
+#include <ostream>
 #include <utility>
 
 #include "CaseFolding.h"
 #include "ClauseShapes.h"
+#include "StandardOutput.h"
 #include "TracePoints.h"
 
 using libschema::isOneOf;
 
 namespace {
 
-const std::string accessClass = "normal";
-
-const char kNoLength[] = "0";
+// The values of an entry without the clause, there before any static object is constructed.
+constexpr char accessClass[] = "normal";
+constexpr char kNoLength[] = "0";
 
 // What ends DBNAME. The end of the input does not.
 bool endsDatabaseNames(int token) {
@@ -103,7 +104,7 @@ int ORVAttribute::parseDatabaseNames(SchemaLexan* lexer, bool* isComplete) {
       dbNames.push_back(libschema::textOf(lexer));
     }
     if (token == TOKEN_END) {
-      libschema::spin();
+      libschema::spin(lexer);
     }
     token = lexer->lexan();
   }
@@ -163,10 +164,12 @@ void ORVAttribute::dump() {
   text += "\nnames--> ";
   libschema::appendSpaced(dbNames, &text);
   text += "\n";
-  std::cout << text << std::flush;
+  libschema::standardOutput() << text << std::flush;
 }
 
-bool ORVAttribute::orvAttrsEqual(const ORVAttribute& other) const {
+bool ORVAttribute::orvAttrsEqual(const ORVAttribute& other) { return isEqualTo(other); }
+
+bool ORVAttribute::isEqualTo(const ORVAttribute& other) const {
   tracepoint::ORVAttributeOrvAttrsEqual trace;
   return OID == other.OID && access == other.access && equality == other.equality &&
          ordering == other.ordering && substr == other.substr && approx == other.approx &&
@@ -174,6 +177,6 @@ bool ORVAttribute::orvAttrsEqual(const ORVAttribute& other) const {
          dbNames.size() == other.dbNames.size() && libschema::hasPartners(dbNames, other.dbNames);
 }
 
-std::string ORVAttribute::convert(std::string s) const { return libschema::lowered(std::move(s)); }
+std::string ORVAttribute::convert(std::string s) { return libschema::lowered(std::move(s)); }
 
-std::string ORVAttribute::getOidAndName() const { return libschema::reportEntry(OID, dbNames); }
+std::string ORVAttribute::getOidAndName() { return libschema::reportEntry(OID, dbNames); }

@@ -31,14 +31,31 @@ class ORVAttribute : public Attribute {
   // Returns true when both entries are the same: database names in any order and letter case,
   // everything else exactly. The database names of this entry must be among those of `other`, with
   // equal counts; the test is not made from the other side.
-  bool orvAttrsEqual(const ORVAttribute& other) const;
+  bool orvAttrsEqual(const ORVAttribute& other);
+
+  // The same, with the same trace records, of a definition that is constant.
+  bool isEqualTo(const ORVAttribute& other) const;
 
   // Returns `s` with every character passed through tolower.
-  std::string convert(std::string s) const;
+  std::string convert(std::string s);
 
   // Returns the entry of a collision report: "OID --> …\nName --> …\n\n". The second line lists the
   // database names, joined by ", ", since an entry has no names.
-  std::string getOidAndName() const;
+  std::string getOidAndName();
+
+  // DBNAME in file order, duplicates kept; ACCESS-CLASS, "normal" without the clause; LENGTH as
+  // text, "0" without the clause. Valid as long as the entry is there and unchanged.
+  const std::vector<std::string>& getDbNames() const { return dbNames; }
+  const std::string& getAccessClass() const { return access; }
+  const std::string& getLength() const { return length; }
+
+  // Whether the keyword of the same name was there. An entry's getEquality(), getOrdering() and
+  // getSubstr() are those of an attribute type, and empty.
+  bool hasEquality() const { return equality; }
+  bool hasOrdering() const { return ordering; }
+  bool hasSubstr() const { return substr; }
+  bool hasApprox() const { return approx; }
+  bool hasReverse() const { return reverse; }
 
   // Appends the line that dump(std::ofstream&) writes, with that operation's trace records. For a
   // caller that writes many definitions through a buffer of its own.

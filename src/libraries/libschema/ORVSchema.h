@@ -20,18 +20,23 @@ class ORVSchema {
   virtual void dump(std::ofstream& out) = 0;
 
   // Copies of the members.
-  virtual std::string getOid() const = 0;
-  virtual std::string getDescription() const = 0;
-  virtual std::vector<std::string> getSuperior() const = 0;
+  virtual std::string getOid() = 0;
+  virtual std::string getDescription() = 0;
+  virtual std::vector<std::string> getSuperior() = 0;
 
   // The first name as read, and in lower case; empty when there is no name.
-  virtual std::string getFirstName() const = 0;
-  virtual std::vector<std::string> getNames() const = 0;
-  virtual std::string getFirstNameLower() const = 0;
+  virtual std::string getFirstName() = 0;
+  virtual std::vector<std::string> getNames() = 0;
+  virtual std::string getFirstNameLower() = 0;
 
-  // The OID and the names in place: valid as long as the definition is there and unchanged.
+  // The members in place: valid as long as the definition is there and unchanged.
   const std::string& oidInPlace() const { return OID; }
   const std::vector<std::string>& namesInPlace() const { return names; }
+  const std::string& descriptionInPlace() const { return description; }
+  const std::vector<std::string>& superiorsInPlace() const { return superiors; }
+
+  // The first name with every character passed through tolower; empty when there is no name.
+  std::string firstNameLower() const;
 
  protected:
   ORVSchema(const ORVSchema&) = default;

@@ -1,10 +1,11 @@
 #include "ObjectClass.h"
 
-#include <iostream>
+#include <ostream>
 #include <utility>
 
 #include "CaseFolding.h"
 #include "ClauseShapes.h"
+#include "StandardOutput.h"
 #include "TracePoints.h"
 
 using libschema::isOneOf;
@@ -35,7 +36,7 @@ int readNames(SchemaLexan* lexer, std::vector<std::string>* names) {
       names->push_back(libschema::textOf(lexer));
     }
     if (token == TOKEN_END) {
-      libschema::spin();
+      libschema::spin(lexer);
     }
     token = lexer->lexan();
   }
@@ -179,10 +180,12 @@ void ObjectClass::dump() {
   text += "\noptional Attrs --> ";
   libschema::appendSpaced(optAttrs, &text);
   text += "\n\n\n";
-  std::cout << text << std::flush;
+  libschema::standardOutput() << text << std::flush;
 }
 
-bool ObjectClass::objsEqual(const ObjectClass& other) const {
+bool ObjectClass::objsEqual(const ObjectClass& other) { return isEqualTo(other); }
+
+bool ObjectClass::isEqualTo(const ObjectClass& other) const {
   tracepoint::ObjectClassObjsEqual trace;
   return OID == other.OID && description == other.description && obsolete == other.obsolete &&
          structuralType == other.structuralType && names.size() == other.names.size() &&
@@ -193,24 +196,24 @@ bool ObjectClass::objsEqual(const ObjectClass& other) const {
          libschema::hasPartners(superiors, other.superiors);
 }
 
-std::string ObjectClass::getOid() const { return OID; }
+std::string ObjectClass::getOid() { return OID; }
 
-std::string ObjectClass::getDescription() const { return description; }
+std::string ObjectClass::getDescription() { return description; }
 
-std::vector<std::string> ObjectClass::getSuperior() const { return superiors; }
+std::vector<std::string> ObjectClass::getSuperior() { return superiors; }
 
-std::string ObjectClass::getFirstName() const {
-  return names.empty() ? std::string() : names.front();
-}
+std::string ObjectClass::getFirstName() { return names.empty() ? std::string() : names.front(); }
 
-std::vector<std::string> ObjectClass::getNames() const { return names; }
+std::vector<std::string> ObjectClass::getNames() { return names; }
 
-std::string ObjectClass::getFirstNameLower() const { return libschema::lowered(getFirstName()); }
+std::string ObjectClass::getFirstNameLower() { return firstNameLower(); }
 
-std::vector<std::string> ObjectClass::getReqAttrs() const { return reqAttrs; }
+std::vector<std::string> ObjectClass::getReqAttrs() { return reqAttrs; }
 
-std::vector<std::string> ObjectClass::getOptAttrs() const { return optAttrs; }
+std::vector<std::string> ObjectClass::getOptAttrs() { return optAttrs; }
 
-std::string ObjectClass::convert(std::string s) const { return libschema::lowered(std::move(s)); }
+const char* ObjectClass::getStructuralTypeName() const { return kindName(structuralType); }
 
-std::string ObjectClass::getOidAndName() const { return libschema::reportEntry(OID, names); }
+std::string ObjectClass::convert(std::string s) { return libschema::lowered(std::move(s)); }
+
+std::string ObjectClass::getOidAndName() { return libschema::reportEntry(OID, names); }

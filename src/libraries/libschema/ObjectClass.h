@@ -34,24 +34,37 @@ class ObjectClass : public ORVSchema {
   // Returns true when both define the same class: names, superiors, MUST and MAY lists in any order
   // and letter case, everything else exactly. The members of this definition's lists must be among
   // those of `other`, with equal counts; the test is not made from the other side.
-  bool objsEqual(const ObjectClass& other) const;
+  bool objsEqual(const ObjectClass& other);
 
-  std::string getOid() const override;
-  std::string getDescription() const override;
-  std::vector<std::string> getSuperior() const override;
-  std::string getFirstName() const override;
-  std::vector<std::string> getNames() const override;
-  std::string getFirstNameLower() const override;
+  // The same, with the same trace records, of a definition that is constant.
+  bool isEqualTo(const ObjectClass& other) const;
+
+  std::string getOid() override;
+  std::string getDescription() override;
+  std::vector<std::string> getSuperior() override;
+  std::string getFirstName() override;
+  std::vector<std::string> getNames() override;
+  std::string getFirstNameLower() override;
 
   // Copies of the MUST and of the MAY list.
-  std::vector<std::string> getReqAttrs() const;
-  std::vector<std::string> getOptAttrs() const;
+  std::vector<std::string> getReqAttrs();
+  std::vector<std::string> getOptAttrs();
 
   // Returns `s` with every character passed through tolower.
-  std::string convert(std::string s) const;
+  std::string convert(std::string s);
 
   // Returns the entry of a collision report: "OID --> …\nName --> …\n\n", the names joined by ", ".
-  std::string getOidAndName() const;
+  std::string getOidAndName();
+
+  // The lists in place: valid as long as the definition is there and unchanged.
+  const std::vector<std::string>& reqAttrsInPlace() const { return reqAttrs; }
+  const std::vector<std::string>& optAttrsInPlace() const { return optAttrs; }
+
+  // The kind of class as the code of its keyword (KEY_STRUCTURAL, KEY_AUXILIARY or KEY_ABSTRACT),
+  // and as that keyword.
+  int getStructuralType() const { return structuralType; }
+  const char* getStructuralTypeName() const;
+  bool getObsolete() const { return obsolete; }
 
   // Appends the line that dump(std::ofstream&) writes, with that operation's trace records. For a
   // caller that writes many definitions through a buffer of its own.

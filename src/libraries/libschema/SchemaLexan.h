@@ -1,25 +1,46 @@
 // Turns one schema file into tokens. The file reader creates one analyser for each file and hands
-// it to the definitions, which parse themselves from it. It owns its symbol table; from its
-// construction to its destruction the locale of the whole process is "C", and afterwards it is the
-// environment's.
+// it to the definitions, which parse themselves from it. It owns its symbol table.
+//
+// A derived class may use what it inherits. It may read from m_input, replace the stream buffer of
+// m_input (which then stays the derived class's own) or open another file with it: the next token
+// begins where the stream stands. It may add entries to the symbol table and remove them, and may
+// replace m_symtable by another table made by `new`, which the analyser then owns; the keywords are
+// what that table finds, and m_scratch_index is the entry that the next new text takes the place
+// of. The text of the current token stays in the table, whatever happens to the stream.
 
 #ifndef LIBSCHEMA_SCHEMA_LEXAN_H
 #define LIBSCHEMA_SCHEMA_LEXAN_H
 
+#include <cstddef>
 #include <string>
 #include <string_view>
 
 #include "Clex_analyzer.h"
 #include "SchemaSymbolTable.h"
 
+namespace libschema {
+class LexerTable;
+}
+
 class SchemaLexan : public Clex_analyzer {
  public:
-  // Opens directory + "/" + fileName. A file that cannot be opened or read is not reported here:
-  // fileIsOpen() is false then, and lexan() returns TOKEN_END.
+  // Opens directory + "/" + fileName; nothing is read yet. A file that cannot be opened, or that is
+  // a directory, is not reported here: fileIsOpen() is false then, and lexan() returns TOKEN_END.
+  // From here to the destruction of the analyser the locale of the whole process is "C", and
+  // afterwards it is the environment's, also when the construction fails with an exception.
   SchemaLexan(std::string directory, std::string fileName);
+
+  // Reads the `size` bytes at `bytes` in place of a file; directory and fileName are only what
+  // getWorkingDir() and getFileName() return. Everything else is as over a file with these bytes,
+  // but no file is touched, and the locale neither now nor at the destruction: several threads may
+  // each use an analyser of their own. The bytes are not copied, and must stay as they are as long
+  // as the analyser reads.
+  SchemaLexan(const char* bytes, std::size_t size, std::string directory, std::string fileName);
+
   ~SchemaLexan() override;
 
-  // True while the input is good: opened, no error, and its end not met yet.
+  // True while the input is good: opened, no error, and its end not met yet. Bytes are open from
+  // the start.
   bool fileIsOpen();
 
   // Reads the next token and returns its code; TOKEN_END at the end of the input, and from then on.
@@ -68,10 +89,20 @@ class SchemaLexan : public Clex_analyzer {
   std::string getWorkingDir() override;
 
  private:
+  struct BeforeOpening {};
+  explicit SchemaLexan(BeforeOpening);
+
+  void begin(std::string fileName);
+  void resetLocale();
+  libschema::LexerTable* privateTable();
+  CSymbolTable* table();
   int nextToken();
   int nextTokenOfStream();
   int takeCharacter(int token);
-  int takeText(std::string_view text, bool isInBuffer, int token);
+  int takeText(std::string_view text, int token);
+  int takeStreamText(std::string text, int token);
+  int storeText(std::string text, int token);
+  int takeIndex(int index, int token);
 };
 
 #endif  // LIBSCHEMA_SCHEMA_LEXAN_H

@@ -1,13 +1,15 @@
 #include "SchemaManager.h"
 
 #include <fstream>
-#include <iostream>
+#include <ostream>
+#include <string_view>
 #include <utility>
 
 #include "AscendingLookup.h"
 #include "CaseFolding.h"
 #include "OidWords.h"
 #include "SchemaResults.h"
+#include "StandardOutput.h"
 #include "TracePoints.h"
 #include "timestamp.h"
 
@@ -25,9 +27,19 @@ void deleteAll(Table* table) {
 }
 
 template <typename Table>
-typename Table::mapped_type findIn(const Table& table, const std::string& key) {
+typename Table::mapped_type findIn(const Table& table, std::string_view key) {
   const auto entry = table.find(key);
   return entry == table.end() ? nullptr : entry->second;
+}
+
+template <typename Table>
+bool eraseFrom(Table* table, std::string_view key) {
+  const auto entry = table->find(key);
+  const bool isThere = entry != table->end();
+  if (isThere) {
+    table->erase(entry);
+  }
+  return isThere;
 }
 
 // An absent definition reads as a newly constructed one.
@@ -44,21 +56,23 @@ const ORVAttribute* answerOfGetORVAttr(const ORVAttribute* extension) {
 
 template <typename Table>
 void printTable(const char* heading, const Table& table) {
-  std::cout << heading;
+  std::ostream& out = libschema::standardOutput();
+  out << heading;
   for (const auto& entry : table) {
-    std::cout << std::endl << entry.first << '\t';
+    out << std::endl << entry.first << '\t';
     entry.second->dump();
-    std::cout << std::endl;
+    out << std::endl;
   }
-  std::cout << std::endl;
+  out << std::endl;
 }
 
 void printOids(const char* heading, const std::set<std::string>& oids) {
-  std::cout << heading;
+  std::ostream& out = libschema::standardOutput();
+  out << heading;
   for (const std::string& oid : oids) {
-    std::cout << oid << std::endl;
+    out << oid << std::endl;
   }
-  std::cout << std::endl;
+  out << std::endl;
 }
 
 }  // namespace
@@ -90,13 +104,7 @@ const SchemaManager::SchemaFile* SchemaManager::findFile(const std::string& file
   return nullptr;
 }
 
-SchemaManager::SchemaManager(std::string schemaDirectory)
-    : attrTable(&tableNodes),
-      ocTable(&tableNodes),
-      orvAttrTable(&tableNodes),
-      attrOidTable(&tableNodes),
-      ocOidTable(&tableNodes),
-      directory(std::move(schemaDirectory)) {}
+SchemaManager::SchemaManager(std::string schemaDirectory) : directory(std::move(schemaDirectory)) {}
 
 // The OID indexes only refer: an object that none but they hold is not deleted.
 SchemaManager::~SchemaManager() {
@@ -127,10 +135,10 @@ int SchemaManager::modifySchema(std::string path) {
   }
   for (const std::string& oid : withdrawn) {
     if (findIn(ocOidTable, oid) != nullptr) {
-      ocTable.erase(lookUpObjClass(oid)->getFirstNameLower());
+      eraseFrom(&ocTable, lookUpObjClass(oid)->firstNameLower());
     } else if (findIn(attrOidTable, oid) != nullptr) {
-      attrTable.erase(lookUpAttr(oid)->getFirstNameLower());
-    } else if (orvAttrTable.erase(oid) == 0) {
+      eraseFrom(&attrTable, lookUpAttr(oid)->firstNameLower());
+    } else if (!eraseFrom(&orvAttrTable, oid)) {
       continue;
     }
     static_cast<void>(dropFromModSch(oid));
@@ -143,7 +151,7 @@ int SchemaManager::modifySchema(std::string path) {
 // Only this look-up folds the letter case of its key.  Lookups.OnlyGetAttrFoldsItsKey.
 const Attribute* SchemaManager::lookUpAttr(const std::string& key) const {
   tracepoint::GetAttr trace;
-  const Attribute* const byName = findIn(attrTable, convert(key));
+  const Attribute* const byName = findIn(attrTable, libschema::lowered(key));
   return byName != nullptr ? byName : findIn(attrOidTable, key);
 }
 
@@ -164,7 +172,7 @@ ObjectClass SchemaManager::getObjClass(std::string key) { return copyOf(lookUpOb
 
 ORVAttribute SchemaManager::getORVAttr(std::string key) { return copyOf(lookUpORVAttr(key)); }
 
-std::string SchemaManager::convert(std::string s) const { return libschema::lowered(std::move(s)); }
+std::string SchemaManager::convert(std::string s) { return libschema::lowered(std::move(s)); }
 
 bool SchemaManager::isExcluded(std::string oid) { return excludes(oid); }
 
@@ -236,9 +244,9 @@ int SchemaManager::writeOids(const OidSet& oids, const std::string& path) {
     out.flush();
     text.clear();
   };
-  AscendingLookup<OidTable<ObjectClass>> objectClasses(ocOidTable);
-  AscendingLookup<OidTable<Attribute>> attributes(attrOidTable);
-  AscendingLookup<OidTable<ORVAttribute>> extensions(orvAttrTable);
+  AscendingLookup<Table<ObjectClass>> objectClasses(ocOidTable);
+  AscendingLookup<Table<Attribute>> attributes(attrOidTable);
+  AscendingLookup<Table<ORVAttribute>> extensions(orvAttrTable);
   for (const std::string& oid : oids) {
     const auto objectClass = objectClasses.find(oid);
     if (objectClass != ocOidTable.end()) {

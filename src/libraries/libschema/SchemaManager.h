@@ -15,12 +15,12 @@
 #ifndef LIBSCHEMA_SCHEMA_MANAGER_H
 #define LIBSCHEMA_SCHEMA_MANAGER_H
 
+#include <functional>
 #include <map>
 #include <memory>
 #include <memory_resource>
 #include <set>
 #include <string>
-#include <string_view>
 
 #include "Attribute.h"
 #include "ORVAttribute.h"
@@ -30,7 +30,7 @@
 class SchemaManager {
  public:
   // `directory` is kept as given; readFile looks every file up in it.
-  explicit SchemaManager(std::string directory);
+  SchemaManager(std::string directory);
   ~SchemaManager();
   SchemaManager(const SchemaManager&) = delete;
   SchemaManager& operator=(const SchemaManager&) = delete;
@@ -63,7 +63,7 @@ class SchemaManager {
   ORVAttribute getORVAttr(std::string key);
 
   // Returns `s` with every character passed through tolower.
-  std::string convert(std::string s) const;
+  std::string convert(std::string s);
 
   // True when the OID was listed, character for character, in a file of excluded OIDs.
   bool isExcluded(std::string oid);
@@ -147,12 +147,10 @@ class SchemaManager {
  private:
   using OidSet = std::set<std::string>;
 
-  // The key of a table by OID lies in the definition that the entry holds: a definition stays,
-  // owned or not, as long as a table refers to it.
+  // The keys are the manager's own, in its pool like the entries: a table can be searched whatever
+  // has become of the definitions.
   template <typename Definition>
-  using NameTable = std::pmr::map<std::string, Definition*>;
-  template <typename Definition>
-  using OidTable = std::pmr::map<std::string_view, Definition*>;
+  using Table = std::pmr::map<std::pmr::string, Definition*, std::less<>>;
 
   // A schema file that can be read; `oids` is null for the two that have no set.
   struct SchemaFile {
@@ -180,12 +178,13 @@ class SchemaManager {
   int writeOids(const OidSet& oids, const std::string& path);
 
   std::unique_ptr<SchemaLexan> lexan;  // null but while a file is read
-  std::pmr::monotonic_buffer_resource tableNodes;
-  NameTable<Attribute> attrTable;       // by lower-cased first name; owner
-  NameTable<ObjectClass> ocTable;       // by lower-cased first name; owner
-  OidTable<ORVAttribute> orvAttrTable;  // by OID; owner
-  OidTable<Attribute> attrOidTable;     // by OID; the objects of attrTable
-  OidTable<ObjectClass> ocOidTable;     // by OID; the objects of ocTable
+  // Not the default resource of the process, which the host may replace, and take away.
+  std::pmr::monotonic_buffer_resource pool{std::pmr::new_delete_resource()};
+  Table<Attribute> attrTable{&pool};        // by lower-cased first name; owner
+  Table<ObjectClass> ocTable{&pool};        // by lower-cased first name; owner
+  Table<ORVAttribute> orvAttrTable{&pool};  // by OID; owner
+  Table<Attribute> attrOidTable{&pool};     // by OID; the objects of attrTable
+  Table<ObjectClass> ocOidTable{&pool};     // by OID; the objects of ocTable
   std::string directory;
   OidSet userAtOids;
   OidSet userOcOids;

@@ -4,11 +4,32 @@
 #include "SchemaOperations.h"
 
 #include <string>
-#include <utility>
-#include <vector>
+#include <string_view>
 
+#include "OperationBatches.h"
 #include "SchemaManager.h"
 #include "TracePoints.h"
+
+namespace {
+
+template <typename Table>
+void erase(Table* table, std::string_view key) {
+  const auto entry = table->find(key);
+  if (entry != table->end()) {
+    table->erase(entry);
+  }
+}
+
+// Enters a definition unless the table has the key already.
+template <typename Table>
+void enter(Table* table, std::string_view key, typename Table::mapped_type definition) {
+  const auto place = table->lower_bound(key);
+  if (place == table->end() || place->first != key) {
+    table->emplace_hint(place, key, definition);
+  }
+}
+
+}  // namespace
 
 // ---- Comparison ----
 
@@ -17,29 +38,20 @@
 // hold them.
 template <typename Definition>
 void SchemaManager::Operations::compare(SchemaManager* self, SchemaManager* reference) {
-  using Rules = Kind<Definition>;
-  Table<Definition>& table = self->*Rules::kTable;
-  Walk<Definition> walk(*self, &(reference->*Rules::kTable));
-  Erasures<Definition> dropped;
-  Removals removals(self);
-  for (auto entry = table.begin(); entry != table.end(); ++entry) {
-    const Met<Definition> met = walk.meet(*entry);
-    const Definition* theirs = walk.findInReference(met);
-    if (theirs != nullptr) {
-      theirs = met.isOwnKey ? answerOf<Definition>(theirs)
-                            : &orNew(Rules::lookUp(*reference, std::string(entry->first)));
-    }
-    const Definition& mine = met.definition;
+  Walk<Definition> walk(self, reference);
+  FileSetRemovals removals(self);
+  while (walk.next()) {
+    const Definition& mine = walk.mine();
+    const Definition* const theirs = walk.lookUpTheirs();
     const std::string& oid = mine.oidInPlace();
-    if (!self->excludes(oid) && (theirs == nullptr || !Rules::areEqual(mine, *theirs))) {
-      continue;
-    }
-    dropped.add(entry, met.key);
-    if (Rules::kHasFileSet) {
-      removals.add(oid);
+    if (self->excludes(oid) || (theirs != nullptr && mine.isEqualTo(*theirs))) {
+      walk.drop();
+      if (Kind<Definition>::kIsKeyedByName) {
+        removals.add(oid);
+      }
     }
   }
-  dropped.apply(&table);
+  walk.eraseDropped();
   removals.apply();
 }
 
@@ -86,90 +98,64 @@ SchemaManager::OidSet* SchemaManager::Operations::findFileSet(SchemaManager* sel
 }
 
 // Puts `moved` in the place of the definition that the manager finds under its OID; `place` is the
-// entry found under its name. What goes is the definition with the OID, which can be another one
-// than that with the name: then the old entry under the name stays, and `moved` is entered by OID
-// only. MergeAttrs.NameUnderAnotherOidRemovesTheOtherDefinition.
+// entry found under its key. What goes is the definition with the OID, which can be another one
+// than that with the first name: then the old entry under the name stays, and `moved` is entered by
+// OID only. A vendor extension has no other key.
+// MergeAttrs.NameUnderAnotherOidRemovesTheOtherDefinition.
 template <typename Definition>
-void SchemaManager::Operations::replace(SchemaManager* self, const std::string& name,
-                                        Iterator<Definition> place, Definition* moved) {
+void SchemaManager::Operations::replace(SchemaManager* self,
+                                        typename Table<Definition>::iterator place,
+                                        const std::string& key, Definition* moved) {
   using Rules = Kind<Definition>;
-  Table<Definition>& byName = self->*Rules::kTable;
-  OidTable<Definition>& byOid = self->*Rules::kOidTable;
-  const std::string& oid = moved->oidInPlace();
-  const Definition* const replaced = Rules::lookUp(*self, oid);
-  if (replaced != nullptr) {
-    const std::string replacedName = Rules::keyOf(*replaced);
-    const std::string replacedOid = replaced->oidInPlace();
-    if (replacedName == name) {
-      place->second = moved;
-    } else {
-      byName.erase(replacedName);
+  if constexpr (!Rules::kIsKeyedByName) {
+    place->second = moved;
+  } else {
+    Table<Definition>& byOid = self->*Rules::kOidTable;
+    const std::string& oid = moved->oidInPlace();
+    const Definition* const replaced = Rules::lookUp(*self, oid);
+    if (replaced != nullptr) {
+      const std::string replacedKey = Rules::keyOf(*replaced);
+      if (replacedKey == key) {
+        place->second = moved;
+      } else {
+        erase(&(self->*Rules::kTable), replacedKey);
+      }
+      erase(&byOid, replaced->oidInPlace());
     }
-    const auto indexed = byOid.find(replacedOid);
-    if (indexed != byOid.end() && replacedOid == oid) {
-      rebind(&byOid, indexed, moved);
-      return;
-    }
-    if (indexed != byOid.end()) {
-      byOid.erase(indexed);
-    }
-  }
-  byOid.try_emplace(oid, moved);
-}
-
-// Erases from the source what has been moved out of it: by the names and by the OIDs of the moved
-// definitions.
-template <typename Definition>
-void SchemaManager::Operations::eraseMoved(SchemaManager* source) {
-  using Rules = Kind<Definition>;
-  Table<Definition>& table = source->*Rules::kTable;
-  typename Rules::KeyTest isKeyOf;
-  Erasures<Definition> moved;
-  OidList movedOids;
-  for (auto entry = table.begin(); entry != table.end(); ++entry) {
-    if (isKeyOf(entry->first, *entry->second)) {
-      moved.add(entry, Rules::keyAt(*entry));
-    } else {
-      moved.add(entry, Rules::keyOf(*entry->second));
-    }
-    movedOids.push_back(&entry->second->oidInPlace());
-  }
-  moved.apply(&table);
-  if constexpr (Rules::kHasFileSet) {
-    eraseAll(&(source->*Rules::kOidTable), std::move(movedOids));
+    enter(&byOid, oid, moved);
   }
 }
 
 // Moves the source's definitions, in the order of their keys. Stops, with the source's tables as
-// they were, at one that is lacking here and whose OID is in none of the source's file sets.
+// they were, at one that is lacking here and whose OID is in none of the source's file sets. What
+// has been moved leaves the source: every entry that was met, and the OIDs of the definitions.
 template <typename Definition>
 bool SchemaManager::Operations::merge(SchemaManager* self, SchemaManager* source) {
   using Rules = Kind<Definition>;
   Table<Definition>& table = self->*Rules::kTable;
   Additions<Definition> additions(self);
+  OidErasures movedOids;
   for (const auto& entry : source->*Rules::kTable) {
     Definition* const moved = entry.second;
     const auto& key = Rules::keyOf(*moved);
-    const auto place = table.lower_bound(key);
-    if (place != table.end() && place->first == key) {
+    const auto place = table.lower_bound(std::string_view(key));
+    if (place != table.end() && place->first == std::string_view(key)) {
       additions.enter();
-      if constexpr (Rules::kHasFileSet) {
-        replace(self, key, place, moved);
-      } else {
-        rebind(&table, place, moved);
-      }
-      continue;
-    }
-    OidSet* const oids = findFileSet(self, source, moved->oidInPlace());
-    if (oids == nullptr) {
+      replace(self, place, key, moved);
+    } else if (OidSet* const oids = findFileSet(self, source, moved->oidInPlace())) {
+      additions.add(oids, moved);
+      table.emplace_hint(place, std::string_view(key), moved);
+    } else {
       additions.enter();
       return false;
     }
-    additions.add(oids, moved);
-    table.try_emplace(place, key, moved);
+    movedOids.add(moved->oidInPlace());
   }
   additions.enter();
-  eraseMoved<Definition>(source);
+  (source->*Rules::kTable).clear();
+  if constexpr (Rules::kIsKeyedByName) {
+    movedOids.apply(&(source->*Rules::kOidTable));
+  }
   return true;
 }
 
@@ -211,7 +197,7 @@ bool SchemaManager::mergeObjClasses(SchemaManager* source) {
 // Whether the OID is a key of any of the three tables. Two of them have names for keys: an OID is
 // found there only when a definition's first name is spelled like it.
 // CheckCollisions.OidIsLookedUpAmongNames.
-bool SchemaManager::Operations::isKey(const SchemaManager& reference, const std::string& oid) {
+bool SchemaManager::Operations::isKey(const SchemaManager& reference, std::string_view oid) {
   return reference.ocTable.count(oid) != 0 || reference.attrTable.count(oid) != 0 ||
          reference.orvAttrTable.count(oid) != 0;
 }
@@ -220,22 +206,18 @@ bool SchemaManager::Operations::isKey(const SchemaManager& reference, const std:
 // a vendor extension) or by its OID.
 template <typename Definition>
 void SchemaManager::Operations::check(SchemaManager* self, SchemaManager* reference) {
-  using Rules = Kind<Definition>;
-  Table<Definition>& table = self->*Rules::kTable;
-  Walk<Definition> walk(*self, &(reference->*Rules::kTable));
-  Erasures<Definition> dropped;
-  OidList collidingOids;
-  for (auto entry = table.begin(); entry != table.end(); ++entry) {
-    const Met<Definition> met = walk.meet(*entry);
-    const std::string& oid = met.definition.oidInPlace();
-    if (walk.findInReference(met) == nullptr && !isKey(*reference, oid)) {
-      dropped.add(entry, met.key);
-    } else if (Rules::kPrunesOidTable) {
-      collidingOids.push_back(&oid);
+  Walk<Definition> walk(self, reference);
+  OidErasures collidingOids;
+  while (walk.next()) {
+    const std::string& oid = walk.mine().oidInPlace();
+    if (!walk.isInReference() && !isKey(*reference, oid)) {
+      walk.drop();
+    } else if (Kind<Definition>::kPrunesReference) {
+      collidingOids.add(oid);
     }
   }
-  dropped.apply(&table);
-  eraseAll(&reference->attrOidTable, std::move(collidingOids));
+  walk.eraseDropped();
+  collidingOids.apply(&reference->attrOidTable);
 }
 
 // The order of the passes is its own: comparison and merge take object classes last.
@@ -267,9 +249,9 @@ bool SchemaManager::checkORVAttrs(SchemaManager* reference) {
 
 // ---- Reports ----
 
-template <typename Definitions>
+template <typename Definition>
 std::string SchemaManager::Operations::report(const char* noneText, const char* heading,
-                                              const Definitions& table) {
+                                              const Table<Definition>& table) {
   if (table.empty()) {
     return noneText;
   }

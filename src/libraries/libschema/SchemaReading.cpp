@@ -3,14 +3,16 @@
 #include <array>
 #include <fstream>
 #include <memory>
-#include <optional>
 #include <string>
 #include <utility>
 
 #include "DiagnosticFile.h"
+#include "NewDefinitions.h"
 #include "SchemaManager.h"
 #include "SchemaResults.h"
 #include "TracePoints.h"
+
+using libschema::NewDefinitions;
 
 namespace {
 
@@ -29,7 +31,7 @@ struct ReadingOf<Attribute> {
   static constexpr char kInBlock[] =
       "readFile: (2).Error occured while parsing the attribute: %s\n";
   static constexpr char kNoOpening[] = "readFile: (3).ATTR: Error occured as } was not found\n";
-  static std::string nameOf(const Attribute& failed) { return failed.getFirstNameLower(); }
+  static std::string nameOf(Attribute& failed) { return failed.getFirstNameLower(); }
 };
 
 template <>
@@ -40,7 +42,7 @@ struct ReadingOf<ORVAttribute> {
   static constexpr char kInBlock[] =
       "readFile: (2).Error occured while parsing the orv attribute: %s\n";
   static constexpr char kNoOpening[] = "readFile: (3).ORVATTR: Error occured as } was not found\n";
-  static std::string nameOf(const ORVAttribute& failed) { return failed.getOidAndName(); }
+  static std::string nameOf(ORVAttribute& failed) { return failed.getOidAndName(); }
 };
 
 template <>
@@ -52,7 +54,7 @@ struct ReadingOf<ObjectClass> {
       "readFile: (2).Error occured while parsing the objectclass: %s\n";
   static constexpr char kNoOpening[] =
       "readFile: (3).OBJECTCLASS: Error occured as } was not found\n";
-  static std::string nameOf(const ObjectClass& failed) { return failed.getFirstName(); }
+  static std::string nameOf(ObjectClass& failed) { return failed.getFirstName(); }
 };
 
 }  // namespace
@@ -66,20 +68,63 @@ class SchemaManager::FileReader {
     openDiagnostics();
   }
 
-  // Reads to the end of the file; false at the first failure, with its diagnostics written.
+  // Reads to the end of the file; false at the first failure, with its diagnostics written. What
+  // was read is in the tables then, in any case, also when an exception passes.
   bool readAll() {
+    try {
+      if (!readToTheEnd()) {
+        return false;
+      }
+    } catch (...) {
+      enterAll();
+      throw;
+    }
+    enterAll();
+    return true;
+  }
+
+  // Records that the file could not be read.
+  void reportFailure() {
+    enterAll();
+    TRACE_DEBUG(m_trace, "readFile: There was an error parsing the file, %s.\n", m_file.name);
+  }
+
+  // Writes the analyser's state.
+  void dumpLexer() {
+    m_lexer.dump(kDiagnosticIndent, m_diagnostics.back().stream());
+    m_lexer.dumpTable(kTableDump);
+  }
+
+ private:
+  // Opened and emptied at every read, whether or not anything is wrong.
+  void openDiagnostics() {
+    if (!m_diagnostics[0].open("/tmp/attr.txt")) {
+      TRACE_DEBUG(m_trace, "readFile: unable to open file /tmp/attr.txt\n");
+    }
+    if (!m_diagnostics[1].open("/tmp/orvattr.txt")) {
+      TRACE_DEBUG(m_trace, "readFile: unable to open file /tmp/orvattr.txt\n");
+    }
+    if (!m_diagnostics[2].open("/tmp/objectclass.txt")) {
+      TRACE_DEBUG(m_trace, "readFile: unable to open file /tmp/objectclass.txt\n");
+    }
+    if (!m_diagnostics[3].open("/tmp/lexan.txt")) {
+      TRACE_DEBUG(m_trace, "readFile: unable to open file /tmp/lexan.txt\n");
+    }
+  }
+
+  bool readToTheEnd() {
     int token = m_lexer.lexan();
     while (token != TOKEN_END) {
       bool isRead = true;
       switch (token) {
         case KEY_ATTRIBUTETYPES:
-          isRead = readDefinitions<Attribute>(&token);
+          isRead = readDefinitions(&m_attributes, &token);
           break;
         case KEY_ORVATTRIBUTETYPES:
-          isRead = readDefinitions<ORVAttribute>(&token);
+          isRead = readDefinitions(&m_extensions, &token);
           break;
         case KEY_OBJECTCLASSES:
-          isRead = readDefinitions<ObjectClass>(&token);
+          isRead = readDefinitions(&m_objectClasses, &token);
           break;
         default:
           // Text between definitions is passed over.
@@ -92,38 +137,17 @@ class SchemaManager::FileReader {
     return true;
   }
 
-  // Records that the file could not be read, and writes the analyser's state.
-  void reportFailure() {
-    TRACE_DEBUG(m_trace, "readFile: There was an error parsing the file, %s.\n", m_file.name);
-  }
-  void dumpLexer() {
-    m_lexer.dump(kDiagnosticIndent, m_diagnostics.back());
-    m_lexer.dumpTable(kTableDump);
-  }
-
- private:
-  // Opened and emptied at every read, whether or not anything is wrong.
-  void openDiagnostics() {
-    static constexpr std::array<const char*, 4> kNames = {"/tmp/attr.txt", "/tmp/orvattr.txt",
-                                                          "/tmp/objectclass.txt", "/tmp/lexan.txt"};
-    for (std::size_t i = 0; i < kNames.size(); ++i) {
-      if (!libschema::openDiagnosticFile(kNames[i], &m_diagnostics[i])) {
-        TRACE_DEBUG(m_trace, "readFile: unable to open file %s\n", kNames[i]);
-      }
-    }
-  }
-
   // Reads what follows the keyword of a kind: "=" and one definition, or "{" and a block of them.
   // Leaves in *token the token to go on with.
   template <typename Definition>
-  bool readDefinitions(int* token) {
+  bool readDefinitions(NewDefinitions<Definition>* read, int* token) {
     const int opening = m_lexer.lexan();
     if (opening == '=') {
-      return readOne<Definition>(ReadingOf<Definition>::kSingle, true, token);
+      return readOne(read, ReadingOf<Definition>::kSingle, true, token);
     }
     if (opening == '{') {
       do {
-        if (!readOne<Definition>(ReadingOf<Definition>::kInBlock, false, token)) {
+        if (!readOne(read, ReadingOf<Definition>::kInBlock, false, token)) {
           return false;
         }
       } while (*token != '}');
@@ -138,87 +162,42 @@ class SchemaManager::FileReader {
   // A definition without an OID is inserted in the single form only, under the empty string.
   // ReadFile.SingleDefinitionWithoutOidIsInserted.
   template <typename Definition>
-  bool readOne(const char* message, bool isSingle, int* token) {
+  bool readOne(NewDefinitions<Definition>* read, const char* message, bool isSingle, int* token) {
     auto definition = std::make_unique<Definition>();
     if (!definition->parse(&m_lexer)) {
       reportFailure();
       TRACE_DEBUG(m_trace, message, ReadingOf<Definition>::nameOf(*definition).c_str());
-      definition->dump(m_diagnostics[ReadingOf<Definition>::kDumpFile]);
+      definition->dump(m_diagnostics[ReadingOf<Definition>::kDumpFile].stream());
       dumpLexer();
       return false;
     }
     if (isSingle || !definition->oidInPlace().empty()) {
-      insert(std::move(definition));
+      read->add(std::move(definition));
     }
     *token = m_lexer.getCurrentToken();
     return true;
   }
 
-  // Every table keeps the definition that it has under a key. One that no table takes is deleted.
-  // Neighbours in a file often have neighbouring OIDs, so each insertion by OID starts at the last
-  // one.
-  void insert(std::unique_ptr<Attribute> definition) {
-    noteOid(*definition);
-    insertByNameAndOid(std::move(definition), &m_manager.attrTable, &m_attributes);
-  }
-
-  void insert(std::unique_ptr<ObjectClass> definition) {
-    noteOid(*definition);
-    insertByNameAndOid(std::move(definition), &m_manager.ocTable, &m_objectClasses);
-  }
-
-  void insert(std::unique_ptr<ORVAttribute> definition) {
-    noteOid(*definition);
-    if (m_extensions.insert(definition->oidInPlace(), definition.get())) {
-      static_cast<void>(definition.release());
-    }
-  }
-
-  void noteOid(const ORVSchema& definition) {
-    if (m_file.oids != nullptr) {
-      OidSet& oids = m_manager.*m_file.oids;
-      m_lastOid = oids.insert(m_lastOid.value_or(oids.end()), definition.oidInPlace());
-    }
-  }
-
-  template <typename Definition>
-  class ByOid {
-   public:
-    explicit ByOid(OidTable<Definition>* table) : m_table(*table), m_last(table->end()) {}
-
-    // True when the table holds the definition afterwards.
-    bool insert(const std::string& oid, Definition* definition) {
-      m_last = m_table.try_emplace(m_last, oid, definition);
-      return m_last->second == definition;
-    }
-
-   private:
-    OidTable<Definition>& m_table;
-    typename OidTable<Definition>::iterator m_last;
-  };
-
-  template <typename Definition>
-  static void insertByNameAndOid(std::unique_ptr<Definition> definition,
-                                 NameTable<Definition>* byName, ByOid<Definition>* byOid) {
-    Definition* const inserted = definition.get();
-    if (byName->try_emplace(inserted->getFirstNameLower(), inserted).second) {
-      static_cast<void>(definition.release());
-    }
-    // The index takes the object whether the name table did or not.
-    if (byOid->insert(inserted->oidInPlace(), inserted)) {
-      static_cast<void>(definition.release());
-    }
+  // Enters what was read into the tables and the OID set of the file. Nobody looks into them while
+  // the file is read, so that this is done once for all.
+  void enterAll() {
+    OidSet* const oids = m_file.oids == nullptr ? nullptr : &(m_manager.*m_file.oids);
+    m_attributes.enterByName(&m_manager.attrTable);
+    m_attributes.enterByOid(&m_manager.attrOidTable, oids);
+    m_objectClasses.enterByName(&m_manager.ocTable);
+    m_objectClasses.enterByOid(&m_manager.ocOidTable, oids);
+    m_extensions.enterByOid(&m_manager.orvAttrTable, oids);
   }
 
   SchemaManager& m_manager;
   SchemaLexan& m_lexer;
   const SchemaFile& m_file;
   tracepoint::ReadFile& m_trace;
-  ByOid<Attribute> m_attributes{&m_manager.attrOidTable};
-  ByOid<ObjectClass> m_objectClasses{&m_manager.ocOidTable};
-  ByOid<ORVAttribute> m_extensions{&m_manager.orvAttrTable};
-  std::optional<OidSet::iterator> m_lastOid;
-  std::array<std::ofstream, 4> m_diagnostics;  // by kind of definition, and the analyser's last
+  NewDefinitions<Attribute> m_attributes;
+  NewDefinitions<ORVAttribute> m_extensions;
+  NewDefinitions<ObjectClass> m_objectClasses;
+  // By kind of definition, and the analyser's last.
+  std::array<libschema::DiagnosticFile, 4> m_diagnostics;
 };
 
 int SchemaManager::readFile(std::string fileName) {

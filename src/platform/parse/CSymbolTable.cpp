@@ -1,8 +1,45 @@
 #include "CSymbolTable.h"
 
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+#include <ext/stdio_filebuf.h>
+
 #include <utility>
 
-#include "DiagnosticFile.h"
+inline namespace libschema_platform {
+
+namespace {
+
+std::size_t hashOf(const std::string& text) {
+  return text.empty()
+             ? 0
+             : text.size() * 7 + static_cast<unsigned char>(text.front()) * std::size_t{3} +
+                   static_cast<unsigned char>(text.back());
+}
+
+// Opens `path` for writing, emptied; true when it is a regular file with a single name. The folder
+// may be one that anyone can write to: no symbolic link is followed, and neither a FIFO nor a
+// device blocks or is touched.
+bool openRegularFile(const std::string& path, std::ofstream* out) {
+  constexpr int kFlags = O_WRONLY | O_CREAT | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC;
+  const int descriptor = ::open(path.c_str(), kFlags, 0666);
+  if (descriptor < 0) {
+    return false;
+  }
+  struct stat status {};
+  if (::fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) || status.st_nlink != 1 ||
+      ::ftruncate(descriptor, 0) != 0) {
+    ::close(descriptor);
+    return false;
+  }
+  // The stream takes over the descriptor and closes it.
+  __gnu_cxx::stdio_filebuf<char> buffer(descriptor, std::ios_base::out);
+  *out->rdbuf() = std::move(buffer);
+  return out->is_open();
+}
+
+}  // namespace
 
 CSymbolTable::CSymbolTable() {
   constexpr std::size_t kUsualEntries = 32;
@@ -12,71 +49,59 @@ CSymbolTable::CSymbolTable() {
 
 CSymbolTable::~CSymbolTable() = default;
 
-// The slot behind the last entry. It keeps the text that it had.
-CSymbolTable::Entry* CSymbolTable::nextSlot() {
-  if (m_used == m_entries.size()) {
-    m_entries.emplace_back();
+const CSymbolTable::Entry* CSymbolTable::entryAt(int index) const {
+  if (index < 0 || static_cast<std::size_t>(index) >= m_entries.size()) {
+    return nullptr;
   }
-  return &m_entries[m_used];
+  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
+  return entry.kind == Kind::kNone ? nullptr : &entry;
 }
 
-CSymbolTable::Entry* CSymbolTable::appendEntry(Kind kind, int token, bool isKeyword) {
-  Entry* entry = nextSlot();
-  ++m_used;
-  entry->kind = kind;
-  entry->isKeyword = isKeyword;
-  entry->token = token;
-  entry->next = -1;
-  return entry;
+int CSymbolTable::append(Entry entry) {
+  m_entries.push_back(std::move(entry));
+  return static_cast<int>(m_entries.size()) - 1;
+}
+
+// Where the index of a string entry stands, or is to stand, in its bucket: behind every lower one.
+int* CSymbolTable::placeInBucket(int index) {
+  const std::size_t hash = hashOf(m_entries[static_cast<std::size_t>(index)].text);
+  int* place = &m_buckets[hash % m_buckets.size()];
+  while (*place >= 0 && *place < index) {
+    place = &m_entries[static_cast<std::size_t>(*place)].next;
+  }
+  return place;
 }
 
 int CSymbolTable::insertValue(std::string value, int token, bool isKeyword) {
-  return insertText(value, token, isKeyword);
-}
-
-int CSymbolTable::insertText(std::string_view text, int token, bool isKeyword) {
-  // The copy comes first: where there is no memory for it, the table stays as it is.
-  nextSlot()->text.assign(text);
-  appendEntry(Kind::kString, token, isKeyword);
-  const int index = static_cast<int>(m_used) - 1;
-  link(index);
+  const int index = append({Kind::kString, isKeyword, '\0', token, -1, std::move(value)});
+  *placeInBucket(index) = index;
   return index;
 }
 
-int CSymbolTable::replaceText(int index, std::string_view text, int token) {
-  removeValue(index);
-  return insertText(text, token, false);
-}
-
-int CSymbolTable::addBorrowed(int index, std::string_view text, int token) {
-  removeValue(index);
-  keepBorrowed();
-  appendEntry(Kind::kString, token, false);
-  m_borrower = static_cast<int>(m_used) - 1;
-  m_borrowed = text;
-  return m_borrower;
-}
-
-char* CSymbolTable::inputRoom() {
-  if (m_inputRoom == nullptr) {
-    m_inputRoom.reset(new char[kInputRoom]);
-  }
-  return m_inputRoom.get();
-}
-
-void CSymbolTable::keepBorrowed() {
-  if (m_borrower >= 0) {
-    m_entries[static_cast<std::size_t>(m_borrower)].text.assign(m_borrowed);
-    link(std::exchange(m_borrower, -1));
-  }
-}
-
 int CSymbolTable::insertValue(char value, int token, bool isKeyword) {
-  appendEntry(Kind::kCharacter, token, isKeyword)->character = value;
-  return static_cast<int>(m_used) - 1;
+  return append({Kind::kCharacter, isKeyword, value, token, -1, std::string()});
 }
 
-int CSymbolTable::lookUpValue(std::string value) { return findText(value); }
+int CSymbolTable::lookUpValue(std::string value) {
+  int index = m_buckets[hashOf(value) % m_buckets.size()];
+  while (index >= 0 && m_entries[static_cast<std::size_t>(index)].text != value) {
+    index = m_entries[static_cast<std::size_t>(index)].next;
+  }
+  return index;
+}
+
+int CSymbolTable::getTokenValue(int index) {
+  const Entry* const entry = entryAt(index);
+  return entry == nullptr ? -1 : entry->token;
+}
+
+bool CSymbolTable::getValue(int index, std::string& out) {
+  if (!isString(index)) {
+    return false;
+  }
+  out = entryAt(index)->text;
+  return true;
+}
 
 bool CSymbolTable::getValue(int index, char& out) {
   if (!isCharacter(index)) {
@@ -87,33 +112,13 @@ bool CSymbolTable::getValue(int index, char& out) {
 }
 
 bool CSymbolTable::isString(int index) {
-  const Entry* entry = entryAt(index);
+  const Entry* const entry = entryAt(index);
   return entry != nullptr && entry->kind == Kind::kString;
 }
 
 bool CSymbolTable::isCharacter(int index) {
-  const Entry* entry = entryAt(index);
+  const Entry* const entry = entryAt(index);
   return entry != nullptr && entry->kind == Kind::kCharacter;
-}
-
-// Puts the entry into its bucket so that a look-up meets the lowest index first.
-void CSymbolTable::link(int index) {
-  Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  int* place = &m_buckets[bucketOf(entry.text)];
-  while (*place >= 0 && *place < index) {
-    place = &m_entries[static_cast<std::size_t>(*place)].next;
-  }
-  entry.next = *place;
-  *place = index;
-}
-
-void CSymbolTable::unlink(int index) {
-  const Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  int* place = &m_buckets[bucketOf(entry.text)];
-  while (*place != index) {
-    place = &m_entries[static_cast<std::size_t>(*place)].next;
-  }
-  *place = entry.next;
 }
 
 void CSymbolTable::removeValue(int index) {
@@ -121,22 +126,21 @@ void CSymbolTable::removeValue(int index) {
     return;
   }
   Entry& entry = m_entries[static_cast<std::size_t>(index)];
-  if (index == m_borrower) {
-    m_borrower = -1;
-  } else if (entry.kind == Kind::kString) {
-    unlink(index);
+  if (entry.kind == Kind::kString) {
+    *placeInBucket(index) = entry.next;
   }
   entry.kind = Kind::kNone;
-  ++m_holes;
-  while (m_used > 0 && m_entries[m_used - 1].kind == Kind::kNone) {
-    --m_used;
-    --m_holes;
+  ++m_removed;
+  while (!m_entries.empty() && m_entries.back().kind == Kind::kNone) {
+    m_entries.pop_back();
+    --m_removed;
   }
 }
 
 int CSymbolTable::lookUp(int token, int firstIndex) {
-  for (int index = firstIndex < 0 ? 0 : firstIndex; index < static_cast<int>(m_used); ++index) {
-    const Entry* entry = entryAt(index);
+  for (int index = firstIndex < 0 ? 0 : firstIndex;
+       static_cast<std::size_t>(index) < m_entries.size(); ++index) {
+    const Entry* const entry = entryAt(index);
     if (entry != nullptr && entry->token == token) {
       return index;
     }
@@ -146,25 +150,19 @@ int CSymbolTable::lookUp(int token, int firstIndex) {
 
 int CSymbolTable::clear(int /*currentIndex*/) { return -1; }
 
-int CSymbolTable::getTableSize() { return static_cast<int>(m_used - m_holes); }
+int CSymbolTable::getTableSize() { return static_cast<int>(m_entries.size() - m_removed); }
 
 std::string CSymbolTable::describe(std::size_t index) const {
   const Entry& entry = m_entries[index];
-  std::string line = std::to_string(index) + ' ' + std::to_string(entry.token) + ' ';
-  if (entry.kind == Kind::kString) {
-    line.append(1, '"').append(textAt(static_cast<int>(index))).append(1, '"');
-  } else {
-    line += std::string("'") + entry.character + "'";
-  }
-  if (entry.isKeyword) {
-    line += " keyword";
-  }
-  return line;
+  const std::string value = entry.kind == Kind::kString ? '"' + entry.text + '"'
+                                                        : std::string("'") + entry.character + "'";
+  return std::to_string(index) + ' ' + std::to_string(entry.token) + ' ' + value +
+         (entry.isKeyword ? " keyword" : "");
 }
 
 void CSymbolTable::tableDump(std::string fileName) {
   std::ofstream out;
-  if (libschema::openDiagnosticFile(fileName, &out)) {
+  if (openRegularFile(fileName, &out)) {
     dump(0, out);
   }
 }
@@ -172,9 +170,11 @@ void CSymbolTable::tableDump(std::string fileName) {
 void CSymbolTable::dump(int indent, std::ofstream& out) {
   const std::string margin(indent > 0 ? static_cast<std::size_t>(indent) : 0, '\t');
   out << margin << "CSymbolTable, " << getTableSize() << " entries\n";
-  for (std::size_t i = 0; i < m_used; ++i) {
+  for (std::size_t i = 0; i < m_entries.size(); ++i) {
     if (m_entries[i].kind != Kind::kNone) {
       out << margin << describe(i) << '\n';
     }
   }
 }
+
+}  // namespace libschema_platform

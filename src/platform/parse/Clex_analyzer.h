@@ -1,4 +1,5 @@
-// The interface of a lexical analyser over one input file, with the members that every one has.
+// The interface of a lexical analyser over one input file, with the members that every one has. As
+// with CSymbolTable, a server can have a class of this name of its own beside it.
 
 #ifndef LIBSCHEMA_CLEX_ANALYZER_H
 #define LIBSCHEMA_CLEX_ANALYZER_H
@@ -7,6 +8,9 @@
 #include <string>
 
 #include "CSymbolTable.h"
+
+#pragma GCC visibility push(default)
+inline namespace libschema_platform {
 
 class Clex_analyzer {
  public:
@@ -45,14 +49,17 @@ class Clex_analyzer {
  protected:
   Clex_analyzer() = default;
 
-  CSymbolTable* m_symtable = nullptr;  // owned; the buffer of m_input can lie in its input room
+  CSymbolTable* m_symtable = nullptr;  // owned
   std::string m_filename;              // without the directory
-  int m_tokenvalindex = -1;            // index of the current token's text, -1 when it has none
+  int m_tokenvalindex = -1;            // where the current token's text is in it, -1 for nowhere
   std::ifstream m_input;
   int m_lookahead = -1;     // the current token code
   int m_line_num = 0;       // 1-based once the file is opened
-  int m_scratch_index = 0;  // the one entry that is no keyword
+  int m_scratch_index = 0;  // of the one entry that the analyser itself adds
   std::string m_working_dir;
 };
+
+}  // namespace libschema_platform
+#pragma GCC visibility pop
 
 #endif  // LIBSCHEMA_CLEX_ANALYZER_H

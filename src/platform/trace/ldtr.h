@@ -1,14 +1,28 @@
 // The server's trace facility, as far as the library uses it.
 //
 // The facility gives the event mask, the two record writers, the two `debug` entry points and the
-// object `ldtr_fun`. libschema carries weak stand-ins for all of them: a program that defines any
-// of these symbols itself gets its own used instead. The guard template and the small classes
-// around a record are complete in this header.
+// object `ldtr_fun`. The guard template and the small classes around a record are complete in this
+// header.
+//
+// libschema-platform holds a stand-in for each of these symbols, by itself, behind libschema: the
+// server's own is found first, wherever it stands.
+// - In the program, also one that is built with -fvisibility=hidden, or in a shared library that
+// the
+//   program is linked with: nothing is to be done, in whichever order they are linked. A program
+//   that names -lschema-platform itself names it behind the server's library.
+// - In a static archive: the archive stands behind libschema.
+// - libschema.a with the server's shared library: the latter stands before libschema-platform.a,
+//   which can be left out where the server gives every symbol.
+// - libschema in a plug-in: the program exports its symbols (-rdynamic), or they are in a shared
+//   library of the program's or among what the plug-in is linked with.
 
 #ifndef LIBSCHEMA_LDTR_H
 #define LIBSCHEMA_LDTR_H
 
 #include <cstdint>
+
+// Visible to libschema also where a server compiles its definitions with -fvisibility=hidden.
+#pragma GCC visibility push(default)
 
 // The mask of enabled events. It is only read, afresh at every trace point.
 extern std::uint64_t trcEvents;
@@ -27,7 +41,7 @@ class ldtr_formater_local {
       : m_identifier(identifier), m_level(level), m_pointer(pointer) {}
 
   // Writes the entry record.
-  void operator()() const { ldtr_write(m_level, m_identifier, m_pointer); }
+  void operator()() { ldtr_write(m_level, m_identifier, m_pointer); }
 
   // Writes a printf-style debug record. Given by the facility.
   void debug(unsigned long debugLevel, char const* format, ...)
@@ -45,7 +59,7 @@ class ldtr_formater_local {
 // A record under construction, of code outside any numbered function.
 class ldtr_formater_global {
  public:
-  explicit ldtr_formater_global(unsigned long level) : m_level(level) {}
+  ldtr_formater_global(unsigned long level) : m_level(level) {}
 
   // Writes a printf-style debug record. Given by the facility.
   void debug(unsigned long debugLevel, char const* format, ...)
@@ -60,7 +74,7 @@ class ldtr_formater_global {
 // The guard of code outside any numbered function, used through the object `ldtr_fun`.
 class ldtr_function_global {
  public:
-  ldtr_formater_global operator()(unsigned long level) const { return ldtr_formater_global(level); }
+  ldtr_formater_global operator()(unsigned long level) { return ldtr_formater_global(level); }
 };
 
 extern ldtr_function_global ldtr_fun;
@@ -71,7 +85,7 @@ extern ldtr_function_global ldtr_fun;
 template <unsigned long kIdentifier, unsigned long kKind, unsigned long kEntryBit>
 class ldtr_function_local {
  public:
-  explicit ldtr_function_local(void const* pointer) : m_errorCode(0), m_pointer(pointer) {}
+  ldtr_function_local(void const* pointer) : m_errorCode(0), m_pointer(pointer) {}
   ldtr_function_local(const ldtr_function_local&) = delete;
   ldtr_function_local& operator=(const ldtr_function_local&) = delete;
 
@@ -81,7 +95,7 @@ class ldtr_function_local {
     }
   }
 
-  ldtr_formater_local operator()(unsigned long level) const {
+  ldtr_formater_local operator()(unsigned long level) {
     return ldtr_formater_local(kIdentifier, level, m_pointer);
   }
 
@@ -97,5 +111,7 @@ class ldtr_function_local {
   long m_errorCode;
   void const* m_pointer;
 };
+
+#pragma GCC visibility pop
 
 #endif  // LIBSCHEMA_LDTR_H

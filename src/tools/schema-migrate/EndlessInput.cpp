@@ -114,6 +114,7 @@ Outcome Forecaster::readAfterKeyword(int keyword, int* token) {
   const int opening = m_tokens.lexan();
   if (opening != '=' && opening != '{') {
     m_kind = kind;
+    m_begin = begin;
     return failed(
         m_tokens.position(),
         std::string("neither \"=\" nor \"{\" stands behind the word that begins ") +
@@ -415,7 +416,7 @@ int Forecaster::oid() {
 }
 
 Outcome Forecaster::failed(const Position& position, const std::string& problem) {
-  m_forecast = {Reading::kFails, position, problem, 0};
+  m_forecast = {Reading::kFails, position, problem, 0, m_begin};
   return Outcome::kFailed;
 }
 
@@ -425,7 +426,7 @@ Outcome Forecaster::notClosed(const std::string& what) {
 }
 
 Outcome Forecaster::neverEnds(const Position& position, const std::string& problem) {
-  m_forecast = {Reading::kNeverEnds, position, problem, 0};
+  m_forecast = {Reading::kNeverEnds, position, problem, 0, m_begin};
   return Outcome::kNeverEnds;
 }
 

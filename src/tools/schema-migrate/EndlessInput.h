@@ -33,6 +33,7 @@ struct Forecast {
   Position position;    // of what is the matter
   std::string problem;  // what was found, why it cannot be read, how to mend the file; else empty
   std::size_t longestText = 0;  // of the words, quoted strings and numbers met
+  Position begin{0, 0};  // of the definition that is not read to its end; line 0 when there is none
 };
 
 // Is told of what the forecast comes by.

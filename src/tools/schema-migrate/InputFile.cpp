@@ -28,23 +28,23 @@ const char* kindOf(mode_t mode) {
 
 }  // namespace
 
-InputFile::InputFile(const std::string& path) {
-  // Without blocking: a FIFO nobody writes to would hold an ordinary open for ever.
-  m_descriptor = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC);
+InputFile::InputFile(const std::string& path) : InputFile(AT_FDCWD, path) {}
+
+InputFile::InputFile(const Directory& directory, const std::string& name)
+    : InputFile(directory.number(), name) {}
+
+// Without blocking: a FIFO nobody writes to would hold an ordinary open for ever.
+InputFile::InputFile(int directory, const std::string& name)
+    : m_descriptor(
+          ::openat(directory, name.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC)) {
   struct stat status {};
-  if (m_descriptor < 0 || ::fstat(m_descriptor, &status) != 0) {
+  if (!m_descriptor.isOpen() || ::fstat(descriptor(), &status) != 0) {
     const int error = errno;
     struct stat named {};
-    const bool isSocket = error == ENXIO && ::stat(path.c_str(), &named) == 0;
+    const bool isSocket = error == ENXIO && ::fstatat(directory, name.c_str(), &named, 0) == 0;
     m_problem = isSocket ? kindOf(named.st_mode) : systemError(error);
   } else if (!S_ISREG(status.st_mode)) {
     m_problem = kindOf(status.st_mode);
-  }
-}
-
-InputFile::~InputFile() {
-  if (m_descriptor >= 0) {
-    ::close(m_descriptor);
   }
 }
 
@@ -54,7 +54,7 @@ std::size_t InputFile::read(char* buffer, std::size_t size) {
   }
   ssize_t count = 0;
   do {
-    count = ::read(m_descriptor, buffer, size);
+    count = ::read(descriptor(), buffer, size);
   } while (count < 0 && errno == EINTR);
   if (count < 0) {
     m_problem = systemError(errno);

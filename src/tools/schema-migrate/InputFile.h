@@ -8,25 +8,29 @@
 #include <cstdint>
 #include <string>
 
+#include "Descriptor.h"
+#include "Directory.h"
+
 class InputFile {
  public:
-  // Opens `path`. When that fails, or it is no regular file, problem() says why.
+  // Opens `path`, or `name` in a directory. When that fails, or it is no regular file, problem()
+  // says why.
   explicit InputFile(const std::string& path);
-  ~InputFile();
-  InputFile(const InputFile&) = delete;
-  InputFile& operator=(const InputFile&) = delete;
+  InputFile(const Directory& directory, const std::string& name);
 
   // Empty while all is well; otherwise what is the matter, as in "it is a directory".
   const std::string& problem() const { return m_problem; }
 
-  int descriptor() const { return m_descriptor; }
+  int descriptor() const { return m_descriptor.number(); }
 
   // Reads up to `size` bytes and returns their number: 0 at the end and after an error, which
   // problem() tells then.
   std::size_t read(char* buffer, std::size_t size);
 
  private:
-  int m_descriptor = -1;
+  InputFile(int directory, const std::string& name);
+
+  Descriptor m_descriptor;
   std::string m_problem;
 };
 

@@ -3,56 +3,37 @@
 #include <unistd.h>
 
 #include <array>
-#include <climits>
-#include <cstddef>
-#include <cstring>
+#include <csignal>
+#include <string_view>
 
 #include "Messages.h"
-#include "SchemaFiles.h"
 
 namespace {
 
 constexpr std::array<int, 3> kSignals = {SIGINT, SIGTERM, SIGHUP};
-constexpr char kMessage[] =
+constexpr std::string_view kNotInPlace =
     "schema-migrate: error: interrupted; the output directory was not written\n";
+constexpr std::string_view kInPlace =
+    "schema-migrate: error: interrupted; the output directory is complete and in place\n";
 
-using Path = std::array<char, PATH_MAX + 64>;
-
-// Made beforehand: a signal handler must not build strings.
-Path unfinishedDirectory;
-std::array<Path, kSchemaFiles.size()> unfinishedFiles;
-
-void fill(Path* path, const std::string& text) {
-  const std::size_t length = text.size() < path->size() ? text.size() : 0;
-  std::memcpy(path->data(), text.data(), length);
-  (*path)[length] = '\0';
-}
+Removals everything;
 
 extern "C" void removeAndEnd(int /*signal*/) {
-  if (unfinishedDirectory[0] != '\0') {
-    for (const Path& file : unfinishedFiles) {
-      ::unlink(file.data());
-    }
-    ::rmdir(unfinishedDirectory.data());
-  }
-  const ssize_t ignored = ::write(STDERR_FILENO, kMessage, sizeof kMessage - 1);
-  static_cast<void>(ignored);
+  const std::string_view message = everything.run() ? kInPlace : kNotInPlace;
+  writeAll(STDERR_FILENO, message);
   ::_exit(kNotWritten);
 }
 
-sigset_t interruptions() {
-  sigset_t set;
-  sigemptyset(&set);
-  for (const int number : kSignals) {
-    sigaddset(&set, number);
-  }
-  return set;
-}
+}  // namespace
 
-void setAction(void (*handler)(int)) {
+namespace interruption {
+
+void install() {
   struct sigaction action {};
-  action.sa_handler = handler;
-  action.sa_mask = interruptions();
+  action.sa_handler = removeAndEnd;
+  for (const int number : kSignals) {
+    sigaddset(&action.sa_mask, number);
+  }
   for (const int number : kSignals) {
     struct sigaction previous {};
     // A signal that the caller has the program ignore (nohup) stays ignored.
@@ -62,27 +43,6 @@ void setAction(void (*handler)(int)) {
   }
 }
 
-}  // namespace
-
-namespace interruption {
-
-void install() { setAction(removeAndEnd); }
-
-void uninstall() { setAction(SIG_DFL); }
-
-void setUnfinished(const std::string& directory) {
-  const Hold hold;
-  fill(&unfinishedDirectory, directory);
-  for (std::size_t file = 0; file < kSchemaFiles.size(); ++file) {
-    fill(&unfinishedFiles[file], directory + "/" + kSchemaFiles[file]);
-  }
-}
-
-Hold::Hold() {
-  const sigset_t set = interruptions();
-  ::sigprocmask(SIG_BLOCK, &set, &m_previous);
-}
-
-Hold::~Hold() { ::sigprocmask(SIG_SETMASK, &m_previous, nullptr); }
+Removals* removals() { return &everything; }
 
 }  // namespace interruption

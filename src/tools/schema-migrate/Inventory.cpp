@@ -1,9 +1,6 @@
 #include "Inventory.h"
 
-#include <dirent.h>
-
 #include <algorithm>
-#include <cerrno>
 #include <memory>
 
 #include "DefinitionReader.h"
@@ -33,32 +30,13 @@ class Listener : public ForecastObserver {
   std::string* m_warnings;
 };
 
-struct CloseDirectory {
-  void operator()(DIR* directory) const { ::closedir(directory); }
-};
-
-std::vector<std::string> namesIn(const std::string& role, const std::string& directory) {
-  const std::unique_ptr<DIR, CloseDirectory> open(::opendir(directory.c_str()));
-  if (open == nullptr) {
-    throw Failure(kBadInput, errorLine(directory, "the directory of " + role +
-                                                      " cannot be read: " + systemError(errno)));
-  }
-  std::vector<std::string> names;
-  while (const dirent* entry = ::readdir(open.get())) {
-    names.emplace_back(entry->d_name);
-  }
-  std::sort(names.begin(), names.end());
-  return names;
-}
-
 }  // namespace
 
-Inventory::Inventory(std::string role, std::string directory, std::string* warnings)
-    : m_role(std::move(role)), m_directory(std::move(directory)) {
-  findFiles(warnings);
+Inventory::Inventory(const Installation& installation, std::string* warnings)
+    : m_installation(installation) {
   std::string problems;
   for (const std::size_t file : kReadingOrder) {
-    if (m_hasFile[file]) {
+    if (hasFile(file)) {
       problems += readFile(file, warnings);
     }
   }
@@ -69,37 +47,15 @@ Inventory::Inventory(std::string role, std::string directory, std::string* warni
   makeDigests();
 }
 
-std::string Inventory::pathOf(std::size_t file) const {
-  return m_directory + "/" + kSchemaFiles[file];
-}
-
-void Inventory::findFiles(std::string* warnings) {
-  bool isAny = false;
-  for (const std::string& name : namesIn(m_role, m_directory)) {
-    const std::size_t file = schemaFileNumber(name);
-    if (file != kNoSchemaFile) {
-      m_hasFile[file] = true;
-      isAny = true;
-    } else if (name.compare(0, 3, "V3.") == 0) {
-      *warnings += warningLine(
-          m_directory + "/" + printable(name),
-          "not read, since no schema file has this name; rename it if it belongs to the schema");
-    }
-  }
-  if (!isAny) {
-    throw Failure(
-        kBadInput,
-        errorLine(m_directory, "no V3.* schema file in the directory of " + m_role +
-                                   "; name the directory that holds V3.system.at and its like"));
-  }
-}
-
 // Returns the error line, or nothing.
 std::string Inventory::readFile(std::size_t file, std::string* warnings) {
   const std::string path = pathOf(file);
+  if (!m_installation.files[file].problem.empty()) {
+    return errorLine(path, "cannot be read: " + m_installation.files[file].problem);
+  }
   Listener listener(path, warnings);
   {
-    InputFile input(path);
+    InputFile input(directory() + "/" + kSchemaFiles[file]);
     Forecast forecast;
     if (input.problem().empty()) {
       forecast = foreseeReading(&input, &listener);
@@ -131,10 +87,9 @@ std::string Inventory::takeDefinitions(std::size_t file, const std::vector<std::
     definition.object = std::move(object);
     ++m_counts[file];
   };
-  const bool isRead = readDefinitions(m_directory, kSchemaFiles[file], take);
+  const bool isRead = readDefinitions(directory(), kSchemaFiles[file], take);
   if (!isRead || m_counts[file] != lines.size()) {
-    return errorLine(pathOf(file),
-                     "changed while it was read; try again when nothing writes to it");
+    return errorLine(pathOf(file), "its private copy cannot be read any more");
   }
   return "";
 }

@@ -11,22 +11,26 @@
 #include <vector>
 
 #include "Definition.h"
+#include "Inputs.h"
 #include "SchemaFiles.h"
 
 class Inventory {
  public:
-  // `role` is "OLD" or "NEW". Reads every V3.* file of the directory, and first makes sure that
-  // reading it ends. Throws a Failure, with a line for each file that is missing, unreadable or
-  // unparsable. Files that are not read, and oddities in those that are, go to `warnings`.
-  Inventory(std::string role, std::string directory, std::string* warnings);
+  // Reads the copy of every file, and first makes sure that reading it ends. Throws a Failure, with
+  // a line for each file that is unreadable or unparsable. Oddities go to `warnings`. The
+  // installation must stay in place.
+  Inventory(const Installation& installation, std::string* warnings);
   Inventory(const Inventory&) = delete;
   Inventory& operator=(const Inventory&) = delete;
 
-  const std::string& role() const { return m_role; }
-  const std::string& directory() const { return m_directory; }
-  std::string pathOf(std::size_t file) const;
+  // Where the copies are, for the library.
+  const std::string& directory() const { return m_installation.directory; }
 
-  bool hasFile(std::size_t file) const { return m_hasFile[file]; }
+  // As messages show it.
+  std::string pathOf(std::size_t file) const { return m_installation.pathOf(file); }
+
+  bool hasFile(std::size_t file) const { return m_installation.files[file].isThere; }
+  const Installation& installation() const { return m_installation; }
   std::uint64_t countOf(std::size_t file) const { return m_counts[file]; }
 
   // In the order in which the library reads them.
@@ -36,14 +40,11 @@ class Inventory {
   void releaseObjects();
 
  private:
-  void findFiles(std::string* warnings);
   std::string readFile(std::size_t file, std::string* warnings);
   std::string takeDefinitions(std::size_t file, const std::vector<std::uint64_t>& lines);
   void makeDigests();
 
-  std::string m_role;
-  std::string m_directory;
-  std::array<bool, kSchemaFiles.size()> m_hasFile{};
+  const Installation& m_installation;
   std::array<std::uint64_t, kSchemaFiles.size()> m_counts{};
   std::vector<Definition> m_definitions;
   std::size_t m_longestText = 0;

@@ -8,8 +8,21 @@ namespace {
 
 constexpr char kProgram[] = "schema-migrate";
 
+// A backslash is left as it is, so that a text is not changed a second time.
+void appendPrintable(char c, std::string* text) {
+  const auto byte = static_cast<unsigned char>(c);
+  if (byte >= 0x20 && byte < 0x7f) {
+    *text += c;
+    return;
+  }
+  std::array<char, 8> escaped{};
+  std::snprintf(escaped.data(), escaped.size(), "\\x%02X", static_cast<unsigned>(byte));
+  *text += escaped.data();
+}
+
+// Whatever the names of files may hold, it is one line.
 std::string line(const std::string& place, const char* severity, const std::string& text) {
-  return place + ": " + severity + ": " + text + "\n";
+  return wholePrintable(place + ": " + severity + ": " + text) + "\n";
 }
 
 }  // namespace
@@ -36,6 +49,13 @@ std::string placeOf(const std::string& path, const Position& position) {
 
 std::string systemError(int errorNumber) { return std::strerror(errorNumber); }
 
+std::string orList(const std::string& oid, const std::string& purpose) {
+  if (oid.empty() || oid.find_first_of(" \t\n\v\f\r#") != std::string::npos) {
+    return "";
+  }
+  return ", or list " + printable(oid) + " in a file for --exclude-oids " + purpose;
+}
+
 std::string counted(std::uint64_t count, const std::string& noun) {
   return std::to_string(count) + " " + noun + (count == 1 ? "" : "s");
 }
@@ -47,14 +67,15 @@ std::string printable(const std::string& text) {
     if (result.size() >= kLongest) {
       return result + "...";
     }
-    const auto byte = static_cast<unsigned char>(c);
-    if (byte >= 0x20 && byte < 0x7f) {
-      result += c;
-    } else {
-      std::array<char, 8> escaped{};
-      std::snprintf(escaped.data(), escaped.size(), "\\x%02X", static_cast<unsigned>(byte));
-      result += escaped.data();
-    }
+    appendPrintable(c, &result);
+  }
+  return result;
+}
+
+std::string wholePrintable(std::string_view text) {
+  std::string result;
+  for (const char c : text) {
+    appendPrintable(c, &result);
   }
   return result;
 }

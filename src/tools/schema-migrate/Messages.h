@@ -6,9 +6,11 @@
 #include <cstdint>
 #include <stdexcept>
 #include <string>
+#include <string_view>
 
 enum ExitCode : int {
   kDone = 0,
+  kFindings = 1,
   kUsage = 2,
   kBadInput = 3,
   kRefused = 4,
@@ -33,7 +35,8 @@ class Failure : public std::runtime_error {
 };
 
 // One line each, with its line end: "schema-migrate: error: TEXT", "PLACE: error: TEXT" and the
-// same with "warning". A place is a path, or what placeOf makes of one.
+// same with "warning". A place is a path, or what placeOf makes of one. Whatever is in them, the
+// line is printable.
 std::string errorLine(const std::string& text);
 std::string errorLine(const std::string& place, const std::string& text);
 std::string warningLine(const std::string& text);
@@ -46,11 +49,18 @@ std::string placeOf(const std::string& path, const Position& position);
 // The text that goes with `errorNumber`, as in "No such file or directory".
 std::string systemError(int errorNumber);
 
+// ", or list OID in a file for --exclude-oids PURPOSE"; nothing for an OID that no list can hold:
+// none, or one with white space or "#" in it.
+std::string orList(const std::string& oid, const std::string& purpose);
+
 // "1 definition", "2 definitions".
 std::string counted(std::uint64_t count, const std::string& noun);
 
 // Bytes that a terminal could take for a command, and those of 128 and more, as \xNN; a long text
 // is cut short.
 std::string printable(const std::string& text);
+
+// The same, not cut short.
+std::string wholePrintable(std::string_view text);
 
 #endif  // SCHEMA_MIGRATE_MESSAGES_H

@@ -9,30 +9,29 @@ std::unique_ptr<SchemaManager> readAll(const Inventory& inventory) {
   auto manager = std::make_unique<SchemaManager>(inventory.directory());
   for (const std::size_t file : kReadingOrder) {
     if (inventory.hasFile(file) && manager->readFile(kSchemaFiles[file]) != 0) {
-      throw Failure(kBadInput,
-                    errorLine(inventory.pathOf(file),
-                              "cannot be read any more; try again when nothing writes to it"));
+      throw Failure(kNotWritten,
+                    errorLine(inventory.pathOf(file), "its private copy cannot be read any more"));
     }
   }
   return manager;
 }
 
-[[noreturn]] void failList(const std::string& path) {
-  throw Failure(kBadInput, errorLine(path, "the list of OIDs cannot be read any more"));
+[[noreturn]] void failList(const ListFile& list) {
+  throw Failure(kNotWritten, errorLine(list.path, "its private copy cannot be read any more"));
 }
 
 // OLD without what the lists name, and without what NEW defines alike.
 std::unique_ptr<SchemaManager> readCompared(const Installations& installations,
                                             SchemaManager* newOne) {
   std::unique_ptr<SchemaManager> manager = readAll(installations.oldOne);
-  for (const std::string& list : installations.excludeLists) {
-    if (manager->readExcludedOids(list) != 0) {
-      failList(list);
+  for (const ListFile* const list : installations.excludeLists) {
+    if (manager->readExcludedOids(list->copy) != 0) {
+      failList(*list);
     }
   }
-  if (!installations.withdrawList.empty() &&
-      manager->modifySchema(installations.withdrawList) != 0) {
-    failList(installations.withdrawList);
+  const ListFile* const withdrawn = installations.withdrawList;
+  if (withdrawn != nullptr && manager->modifySchema(withdrawn->copy) != 0) {
+    failList(*withdrawn);
   }
   manager->compSchemas(newOne);
   return manager;
@@ -56,8 +55,7 @@ Migration::Migration(const Installations& installations) {
     static_cast<void>(m_merged.release());
     throw Failure(
         kRefused,
-        errorLine(
-            "the merge was refused; an input changed while it was read, so try again when nothing writes to it"));
+        errorLine("the merge was refused, though it was worked out; nothing was written"));
   }
 }
 
@@ -65,10 +63,9 @@ void Migration::write(const std::string& directory) {
   for (std::size_t file = 0; file < kWrittenFiles; ++file) {
     const std::string name = kSchemaFiles[file];
     if (m_merged->writeFile(directory, name) != 0) {
-      throw Failure(
-          kNotWritten,
-          errorLine(directory + "/" + name,
-                    "cannot be created; is there space left, and a right to write there?"));
+      throw Failure(kNotWritten,
+                    errorLine(directory + "/" + name,
+                              "cannot be created; is there space left for private copies?"));
     }
   }
 }

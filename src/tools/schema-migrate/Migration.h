@@ -9,14 +9,15 @@
 #include <string>
 #include <vector>
 
+#include "Inputs.h"
 #include "Inventory.h"
 
-// Where OLD and NEW lie, and the lists that OLD is read with.
+// OLD and NEW, and the lists that OLD is read with.
 struct Installations {
   const Inventory& oldOne;
   const Inventory& newOne;
-  std::vector<std::string> excludeLists;
-  std::string withdrawList;  // empty when there is none
+  std::vector<const ListFile*> excludeLists;
+  const ListFile* withdrawList = nullptr;  // when there is none
 };
 
 // The three reports of what OLD adds or changes that collides with NEW, from managers of their own,
@@ -26,7 +27,7 @@ std::string reportCollisions(const Installations& installations);
 // Merges OLD into NEW and keeps the result.
 class Migration {
  public:
-  // Throws a Failure when an input changed, or when the merge was refused after all.
+  // Throws a Failure when a copy cannot be read, or the merge is refused after all.
   explicit Migration(const Installations& installations);
 
   // Writes the seven files that have a set of OIDs into `directory`. Whether all of it arrived

@@ -45,8 +45,8 @@ class WordReader {
 
 }  // namespace
 
-void readOidList(const std::string& path, std::set<std::string>* oids) {
-  InputFile file(path);
+void readOidList(const ListFile& list, std::set<std::string>* oids) {
+  InputFile file(list.copy);
   WordReader words(oids);
   std::array<char, 4096> buffer{};
   while (const std::size_t count = file.read(buffer.data(), buffer.size())) {
@@ -55,13 +55,14 @@ void readOidList(const std::string& path, std::set<std::string>* oids) {
     }
   }
   if (!file.problem().empty()) {
-    throw Failure(kBadInput, errorLine(path, "the list of OIDs cannot be read: " + file.problem()));
+    throw Failure(kBadInput,
+                  errorLine(list.path, "the list of OIDs cannot be read: " + file.problem()));
   }
   if (!words.lastWord().empty()) {
     throw Failure(
         kBadInput,
         errorLine(
-            placeOf(path, words.line()),
+            placeOf(list.path, words.line()),
             "no line break behind the last OID, " + printable(words.lastWord()) +
                 ", which would therefore not count; add a line break at the end of the file"));
   }

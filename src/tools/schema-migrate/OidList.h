@@ -7,8 +7,10 @@
 #include <set>
 #include <string>
 
-// Adds the words of the file to `oids`. Throws a Failure when it cannot be read, and when the file
+#include "Inputs.h"
+
+// Adds the words of the copy to `oids`. Throws a Failure when it cannot be read, and when the file
 // ends in a word, which the library would not take.
-void readOidList(const std::string& path, std::set<std::string>* oids);
+void readOidList(const ListFile& list, std::set<std::string>* oids);
 
 #endif  // SCHEMA_MIGRATE_OID_LIST_H

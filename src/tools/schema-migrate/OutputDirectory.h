@@ -5,51 +5,53 @@
 #ifndef SCHEMA_MIGRATE_OUTPUT_DIRECTORY_H
 #define SCHEMA_MIGRATE_OUTPUT_DIRECTORY_H
 
-#include <sys/stat.h>
-
+#include <optional>
 #include <string>
+#include <vector>
+
+#include "OutputPlace.h"
+#include "OwnDirectory.h"
+#include "Removals.h"
 
 class OutputDirectory {
  public:
-  // `path` must not exist, or be an empty directory, and lie in none of the two input directories.
-  // Throws a Failure when it cannot be had. Nothing is created yet. Leftovers of runs that were
-  // killed are named in *warnings, and stay.
-  OutputDirectory(const std::string& path, const std::string& from, const std::string& to,
-                  std::string* warnings);
-  ~OutputDirectory();
+  // Nothing is created yet; see OutputPlace.
+  OutputDirectory(const OutputOptions& options, Removals* removals, std::string* warnings);
   OutputDirectory(const OutputDirectory&) = delete;
   OutputDirectory& operator=(const OutputDirectory&) = delete;
 
-  // Creates the directory under its temporary name and returns that path.
-  const std::string& create();
+  // Creates the directory under its temporary name.
+  void create();
 
-  const std::string& partialPath() const { return m_partial; }
+  const Directory& directory() const { return m_own.directory(); }
 
-  // Creates a file in it with the bytes of the file `source`.
-  void copyIn(const std::string& source, const std::string& fileName);
+  // Creates a file in it with the bytes of the file of the same name in `source`, and with `mode`,
+  // or that of any new file.
+  void copyIn(const Directory& source, const std::string& name,
+              std::optional<mode_t> mode = std::nullopt);
 
   // Brings every file in it to the disk, and out of the memory that reading back would come from.
   void sync();
 
   // Brings the directory itself to the disk and renames it into its place. It has the mode of any
-  // new directory, or mode and owner of the empty one that it replaces.
+  // new directory, or mode and owner of the empty one that it replaces. Throws a Failure, with
+  // nothing published, when another directory was put in the place of this one.
   void publish();
 
  private:
-  void checkPlace();
-  void checkIsOutside(const std::string& input) const;
-  void findLeftovers(std::string* warnings) const;
   void giveAttributes();
   void rename();
-  void remove();
+  void takeBack();
 
-  std::string m_path;
-  std::string m_parent;
-  std::string m_name;
-  bool m_replacesEmpty = false;
-  struct stat m_replaced {};
-  std::string m_partial;  // "" while there is none
-  int m_lock = -1;        // held as long as the run is under way
+  OutputPlace m_place;
+  mode_t m_mask;
+  Removals* m_removals;
+  OwnDirectory m_own;
+  struct Written {
+    std::string name;
+    Descriptor file;
+  };
+  std::vector<Written> m_files;
 };
 
 #endif  // SCHEMA_MIGRATE_OUTPUT_DIRECTORY_H

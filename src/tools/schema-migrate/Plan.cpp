@@ -22,8 +22,7 @@ std::string named(const Definition& definition) {
 
 // What to do when NEW's definition is to be kept.
 std::string orExclude(const Definition& definition) {
-  return ", or list " + printable(definition.oid) +
-         " in a file for --exclude-oids to keep what NEW has";
+  return orList(definition.oid, "to keep what NEW has");
 }
 
 }  // namespace

@@ -8,18 +8,17 @@ std::string shown(const std::string& oid) { return oid.empty() ? "(no OID)" : pr
 
 // Why no file set of OLD holds the OID of `lacking`, which NEW lacks.
 std::string whyInNoFile(const Definition& lacking) {
-  const std::string exclude =
-      "or list " + shown(lacking.oid) + " in a file for --exclude-oids to go without it";
+  const std::string exclude = orList(lacking.oid, "to go without it");
   if (lacking.file >= kMergedFiles) {
     return "NEW lacks it, and OLD knows it only from " + std::string(kSchemaFiles[lacking.file]) +
-           ", so that no file of the output would hold it; put its line into V3.user.at or V3.user.oc of OLD as well, " +
+           ", so that no file of the output would hold it; put its line into V3.user.at or V3.user.oc of OLD as well" +
            exclude;
   }
   if (lacking.kind == DefinitionKind::kVendorExtension) {
-    return "NEW lacks it but defines its attribute type as OLD does, and with that the OID leaves the only file of OLD that holds it; put its line into V3.orv.at of OLD as well, " +
+    return "NEW lacks it but defines its attribute type as OLD does, and with that the OID leaves the only file of OLD that holds it; put its line into V3.orv.at of OLD as well" +
            exclude;
   }
-  return "NEW lacks it, and its OID leaves the files of OLD with another definition of the same OID, which NEW has; give it an OID of its own, " +
+  return "NEW lacks it, and its OID leaves the files of OLD with another definition of the same OID, which NEW has; give it an OID of its own" +
          exclude;
 }
 
@@ -98,19 +97,18 @@ void Rehearsal::replace(const Definition& moved, const Definition& named) {
   if (moved.kind != DefinitionKind::kVendorExtension) {
     const Definition* const going = m_new.lookUp(moved.kind, moved.oid);
     if (going != nullptr && going != &named) {
-      return refuse(
-          moved,
-          "NEW has the first name in " + describe(named) + " at " + placeOf(named) +
-              " and the OID in " + describe(*going) + " at " + placeOf(*going) +
-              ", which the merge would remove; make name and OID agree with NEW's, or list " +
-              shown(moved.oid) + " in a file for --exclude-oids to keep what NEW has");
+      return refuse(moved,
+                    "NEW has the first name in " + describe(named) + " at " + placeOf(named) +
+                        " and the OID in " + describe(*going) + " at " + placeOf(*going) +
+                        ", which the merge would remove; make name and OID agree with NEW's" +
+                        orList(moved.oid, "to keep what NEW has"));
     }
     if (named.oid != moved.oid) {
       return refuse(
           moved,
           "NEW gives the first name to the OID " + shown(named.oid) + " at " + placeOf(named) +
-              ", and the merge would lose OLD's; give it NEW's OID or a first name of its own, or list " +
-              shown(moved.oid) + " in a file for --exclude-oids to keep what NEW has");
+              ", and the merge would lose OLD's; give it NEW's OID or a first name of its own" +
+              orList(moved.oid, "to keep what NEW has"));
     }
     m_new.byOid(moved.kind)[moved.oid] = &moved;
   }
@@ -131,8 +129,8 @@ void Rehearsal::add(const Definition& moved) {
       return refuse(
           moved,
           "NEW gives the OID to " + describe(*holder) + " at " + placeOf(*holder) +
-              ", and the merge would lose OLD's; give it NEW's first name or an OID of its own, or list " +
-              shown(moved.oid) + " in a file for --exclude-oids to keep what NEW has");
+              ", and the merge would lose OLD's; give it NEW's first name or an OID of its own" +
+              orList(moved.oid, "to keep what NEW has"));
     }
     m_new.byOid(moved.kind).try_emplace(moved.oid, &moved);
   }

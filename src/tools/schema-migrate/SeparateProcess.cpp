@@ -10,8 +10,8 @@
 #include <csignal>
 #include <cstddef>
 #include <exception>
-#include <string_view>
 
+#include "Descriptor.h"
 #include "Messages.h"
 
 namespace {
@@ -20,17 +20,6 @@ namespace {
   throw Failure(kNotWritten,
                 errorLine("a process of its own for the collision reports cannot be made: " +
                           systemError(errno)));
-}
-
-bool writeAll(int descriptor, std::string_view text) {
-  while (!text.empty()) {
-    const ssize_t count = ::write(descriptor, text.data(), text.size());
-    if (count < 0 && errno != EINTR) {
-      return false;
-    }
-    text.remove_prefix(static_cast<std::size_t>(count > 0 ? count : 0));
-  }
-  return true;
 }
 
 std::string readAll(int descriptor) {
@@ -46,9 +35,13 @@ std::string readAll(int descriptor) {
 }
 
 // Hands over the text of `make`, or the lines of its failure; the exit code tells which.
-[[noreturn]] void serve(int descriptor, const std::function<std::string()>& make) {
-  // It must not outlive the program; an interruption is the program's to tell.
+[[noreturn]] void serve(int descriptor, pid_t parent, const std::function<std::string()>& make) {
+  // It must not outlive the program, which may have ended already; an interruption is the
+  // program's to tell.
   ::prctl(PR_SET_PDEATHSIG, SIGKILL);
+  if (::getppid() != parent) {
+    ::_exit(kNotWritten);
+  }
   for (const int number : {SIGINT, SIGTERM, SIGHUP}) {
     std::signal(number, SIG_DFL);
   }
@@ -61,6 +54,9 @@ std::string readAll(int descriptor) {
   } catch (const std::exception& error) {
     writeAll(descriptor, errorLine(error.what()));
     ::_exit(kNotWritten);
+  } catch (...) {
+    writeAll(descriptor, errorLine("the collision reports could not be made"));
+    ::_exit(kNotWritten);
   }
 }
 
@@ -71,10 +67,11 @@ std::string textFromSeparateProcess(const std::function<std::string()>& make) {
   if (::pipe2(ends.data(), O_CLOEXEC) != 0) {
     failSystem();
   }
+  const pid_t parent = ::getpid();
   const pid_t child = ::fork();
   if (child == 0) {
     ::close(ends[0]);
-    serve(ends[1], make);
+    serve(ends[1], parent, make);
   }
   ::close(ends[1]);
   std::string text = child < 0 ? std::string() : readAll(ends[0]);
@@ -88,8 +85,17 @@ std::string textFromSeparateProcess(const std::function<std::string()>& make) {
                   errorLine("the collision reports could not be made: ended by signal " +
                             std::to_string(WTERMSIG(status))));
   }
-  if (WEXITSTATUS(status) != kDone) {
-    throw Failure(static_cast<ExitCode>(WEXITSTATUS(status)), text);
+  switch (const int code = WEXITSTATUS(status)) {
+    case kDone:
+      return text;
+    case kUsage:
+    case kBadInput:
+    case kRefused:
+    case kNotWritten:
+      throw Failure(static_cast<ExitCode>(code), text);
+    default:
+      throw Failure(kNotWritten,
+                    text + errorLine("the collision reports could not be made: ended with code " +
+                                     std::to_string(code)));
   }
-  return text;
 }

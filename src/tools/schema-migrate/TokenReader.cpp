@@ -23,9 +23,9 @@ constexpr Keyword kSpellings[] = {
 };
 
 // The token of a keyword; -1 for any other text.
-int keywordToken(std::string_view text) {
+int keywordToken(const std::string& text) {
   static SchemaSymbolTable keywords;
-  const int index = keywords.findText(text);
+  const int index = keywords.lookUpValue(text);
   if (index >= 0) {
     return keywords.getTokenValue(index);
   }

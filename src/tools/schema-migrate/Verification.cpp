@@ -1,6 +1,8 @@
 #include "Verification.h"
 
+#include <algorithm>
 #include <cstddef>
+#include <cstdint>
 #include <memory>
 #include <string_view>
 #include <utility>
@@ -24,6 +26,29 @@ using Contents = std::vector<const Definition*>;
   throw Failure(kNotWritten, errorLine(path, text));
 }
 
+// What stands in a line, counted from 0, of a file with these definitions.
+std::string wanted(std::uint64_t line, const Contents& expected, bool isEmpty) {
+  if (line > expected.size() || isEmpty) {
+    return "the end of the file";
+  }
+  if (line == 0) {
+    return "the header";
+  }
+  const Definition& definition = *expected[line - 1];
+  return describe(definition) + " of " + placeOf(definition);
+}
+
+[[noreturn]] void failChanged(const std::string& path, std::uint64_t line,
+                              const std::string& what) {
+  fail(placeOf(path, line + 1),
+       "does not hold what was written: " + what + "; is the disk in order?");
+}
+
+[[noreturn]] void failShort(const std::string& path, std::uint64_t line, const std::string& what) {
+  fail(path, "was not written completely: it ends in line " + std::to_string(line + 1) +
+                 ", before " + what + "; is there space left on the file system?");
+}
+
 // Goes through the bytes of a written file, line by line.
 class LineChecker {
  public:
@@ -39,8 +64,7 @@ class LineChecker {
       return;
     }
     if (m_line == 0 ? m_header != kHeader : !isExpected()) {
-      fail(placeOf(m_path, m_line + 1),
-           "does not hold what was written: " + wanted() + "; is the disk in order?");
+      failChanged(m_path, m_line, wanted(m_line, m_expected, false));
     }
     ++m_line;
     m_digest = Digest();
@@ -48,25 +72,13 @@ class LineChecker {
 
   void end() const {
     if (m_digest.length() != 0 || m_line != m_expected.size() + 1) {
-      fail(m_path, "was not written completely: it ends in line " + std::to_string(m_line + 1) +
-                       ", before " + wanted() + "; is there space left on the file system?");
+      failShort(m_path, m_line, wanted(m_line, m_expected, false));
     }
   }
 
  private:
   bool isExpected() const {
     return m_line <= m_expected.size() && m_digest == m_expected[m_line - 1]->lineDigest;
-  }
-
-  std::string wanted() const {
-    if (m_line == 0) {
-      return "the header";
-    }
-    if (m_line > m_expected.size()) {
-      return "the end of the file";
-    }
-    const Definition& definition = *m_expected[m_line - 1];
-    return describe(definition) + " of " + placeOf(definition);
   }
 
   std::string m_path;
@@ -76,8 +88,10 @@ class LineChecker {
   Digest m_digest;
 };
 
-void checkBytes(const std::string& path, const Contents& expected, bool isEmpty) {
-  InputFile file(path);
+void checkLines(const Directory& written, const std::string& name, const Contents& expected,
+                bool isEmpty) {
+  const std::string path = written.pathOf(name);
+  InputFile file(written, name);
   LineChecker checker(path, expected);
   std::vector<char> buffer(kBufferSize);
   std::size_t total = 0;
@@ -100,27 +114,43 @@ void checkBytes(const std::string& path, const Contents& expected, bool isEmpty)
   fail(
       placeOf(definition),
       describe(definition) +
-          " would not be read again as it is written: a value in quotes that is neither a name nor a description, an empty value and a second SUP do not survive; mend the definition, or list " +
-          printable(definition.oid) + " in a file for --exclude-oids if it is OLD's");
+          " would not be read again as it is written: a value in quotes that is neither a name nor a description, an empty value and a second SUP do not survive; mend the definition" +
+          orList(definition.oid, "if it is OLD's"));
 }
+
+// Keeps in which lines the definitions begin.
+class Beginnings : public ForecastObserver {
+ public:
+  void definition(DefinitionKind /*kind*/, const Position& begin) override {
+    m_lines.push_back(begin.line);
+  }
+  void oddity(const Position& /*position*/, const std::string& /*problem*/) override {}
+
+  // The definition in whose line reading went astray, where a definition stands in each line below
+  // the header, and the one that begins in `last` is not read to its end. It is the one before the
+  // first that does not begin in a line of its own, or else the one whose beginning was read last.
+  // Null when there is none.
+  const Definition* culprit(const Contents& expected, std::uint64_t last) const {
+    std::size_t count = 0;
+    while (count < m_lines.size() && m_lines[count] == count + 2) {
+      ++count;
+    }
+    const std::uint64_t line = count == m_lines.size() ? last : count + 1;
+    return line >= 2 && line - 2 < expected.size() ? expected[line - 2] : nullptr;
+  }
+
+ private:
+  std::vector<std::uint64_t> m_lines;
+};
 
 // Definitions as the library reads them.
 class ReadBack {
  public:
-  // Returns what the reading comes to, or would come to.
-  Forecast read(const std::string& directory, const std::string& name) {
-    Forecast forecast;
-    {
-      InputFile file(directory + "/" + name);
-      forecast = foreseeReading(&file, nullptr);
-    }
-    const auto take = [this](DefinitionKind kind, bool, std::unique_ptr<ORVSchema> object) {
-      m_objects.emplace_back(kind, std::move(object));
-    };
-    if (forecast.reading == Reading::kSucceeds && !readDefinitions(directory, name, take)) {
-      forecast.reading = Reading::kFails;
-    }
-    return forecast;
+  bool read(const std::string& directory, const std::string& name) {
+    return readDefinitions(directory, name,
+                           [this](DefinitionKind kind, bool, std::unique_ptr<ORVSchema> object) {
+                             m_objects.emplace_back(kind, std::move(object));
+                           });
   }
 
   // The first definition that is not what was expected, or null.
@@ -144,60 +174,105 @@ class ReadBack {
 };
 
 // Reads the file with the library, as the new release will.
-void checkReading(const std::string& directory, const std::string& name, const Contents& expected) {
+void checkReading(const Directory& written, const std::string& path, const std::string& name,
+                  const Contents& expected) {
+  Beginnings beginnings;
+  InputFile file(written, name);
+  const Forecast forecast = foreseeReading(&file, &beginnings);
+  const bool isForeseen = forecast.reading == Reading::kSucceeds;
   ReadBack back;
-  const Forecast forecast = back.read(directory, name);
-  const std::uint64_t line = forecast.position.line;
-  if (forecast.reading != Reading::kSucceeds && line >= 2 && line - 2 < expected.size()) {
-    // A definition stands in each line below the header.
-    failReadingBack(*expected[line - 2]);
+  const bool isRead = isForeseen && back.read(path, name);
+  const Definition* const culprit =
+      isForeseen ? back.firstChanged(expected) : beginnings.culprit(expected, forecast.begin.line);
+  if (culprit != nullptr) {
+    failReadingBack(*culprit);
   }
-  if (const Definition* const changed = back.firstChanged(expected)) {
-    failReadingBack(*changed);
-  }
-  if (forecast.reading != Reading::kSucceeds || back.count() != expected.size()) {
-    fail(directory + "/" + name, "would not be read again as it is written");
+  if (!isRead || back.count() != expected.size()) {
+    fail(written.pathOf(name), "would not be read again as it is written");
   }
 }
 
-void checkCopy(const std::string& path, const std::string& original) {
-  InputFile copy(path);
-  InputFile source(original);
+// Fills the buffer, unless the file ends before.
+std::string_view readBlock(InputFile* file, std::vector<char>* buffer) {
+  std::size_t done = 0;
+  while (const std::size_t count = file->read(buffer->data() + done, buffer->size() - done)) {
+    done += count;
+  }
+  return {buffer->data(), done};
+}
+
+// How far two files are the same.
+struct Comparison {
+  bool isSame = false;
+  bool isShort = false;    // the copy ends where the original goes on
+  std::uint64_t line = 0;  // where they differ, counted from 0
+  std::string problem;     // when one cannot be read
+};
+
+Comparison compare(InputFile* copy, InputFile* original) {
+  Comparison result;
   std::vector<char> copied(kBufferSize);
-  std::vector<char> wanted(kBufferSize);
+  std::vector<char> wantedBytes(kBufferSize);
   for (;;) {
-    const std::size_t count = source.read(wanted.data(), wanted.size());
-    std::size_t done = 0;
-    while (done < count) {
-      const std::size_t more = copy.read(copied.data() + done, count - done);
-      if (more == 0) {
-        break;
-      }
-      done += more;
+    const std::string_view one = readBlock(copy, &copied);
+    const std::string_view other = readBlock(original, &wantedBytes);
+    result.problem = copy->problem() + original->problem();
+    const std::size_t common = std::min(one.size(), other.size());
+    const auto end = std::mismatch(one.begin(), one.begin() + common, other.begin()).first;
+    result.line += static_cast<std::uint64_t>(std::count(one.begin(), end, '\n'));
+    const bool isEqual = one == other;
+    if (!result.problem.empty() || !isEqual || one.empty()) {
+      result.isSame = result.problem.empty() && isEqual;
+      result.isShort = !isEqual && end == one.end();
+      return result;
     }
-    const bool isSame = done == count && std::string_view(copied.data(), count) ==
-                                             std::string_view(wanted.data(), count);
-    const bool isEnd = count == 0;
-    if (!isSame || !source.problem().empty() || (isEnd && copy.read(copied.data(), 1) != 0)) {
-      fail(path, "is not the copy of " + original + " that it has to be");
-    }
-    if (isEnd) {
-      return;
-    }
+  }
+}
+
+void checkFile(const Directory& output, const Directory& written, const std::string& name,
+               const Contents& expected, bool isEmpty) {
+  InputFile copy(output, name);
+  InputFile original(written, name);
+  const Comparison result = compare(&copy, &original);
+  const std::string path = output.pathOf(name);
+  if (!result.problem.empty()) {
+    fail(path, "cannot be read back: " + result.problem);
+  }
+  if (result.isShort) {
+    failShort(path, result.line, wanted(result.line, expected, isEmpty));
+  }
+  if (!result.isSame) {
+    failChanged(path, result.line, wanted(result.line, expected, isEmpty));
+  }
+}
+
+void checkCopy(const Directory& output, const Inventory& newOne, std::size_t number) {
+  const std::string name = kSchemaFiles[number];
+  InputFile copy(output, name);
+  InputFile original(*newOne.installation().copies, name);
+  if (!compare(&copy, &original).isSame) {
+    fail(output.pathOf(name), "is not the copy of " + newOne.pathOf(number) + " that it has to be");
   }
 }
 
 }  // namespace
 
-void verifyOutput(const std::string& directory, const Plan& plan, const Inventory& newOne) {
+void verifyWritten(const Directory& written, const std::string& path, const Plan& plan) {
   for (std::size_t file = 0; file < kWrittenFiles; ++file) {
     const Contents& expected = plan.contents(file);
-    checkBytes(directory + "/" + kSchemaFiles[file], expected, plan.isWrittenEmpty(file));
-    checkReading(directory, kSchemaFiles[file], expected);
+    checkLines(written, kSchemaFiles[file], expected, plan.isWrittenEmpty(file));
+    checkReading(written, path, kSchemaFiles[file], expected);
+  }
+}
+
+void verifyOutput(const Directory& output, const Directory& written, const Plan& plan,
+                  const Inventory& newOne) {
+  for (std::size_t file = 0; file < kWrittenFiles; ++file) {
+    checkFile(output, written, kSchemaFiles[file], plan.contents(file), plan.isWrittenEmpty(file));
   }
   for (std::size_t file = kWrittenFiles; file < kSchemaFiles.size(); ++file) {
     if (newOne.hasFile(file)) {
-      checkCopy(directory + "/" + kSchemaFiles[file], newOne.pathOf(file));
+      checkCopy(output, newOne, file);
     }
   }
 }

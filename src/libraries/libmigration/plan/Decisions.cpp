@@ -1,0 +1,525 @@
+// Carrying decisions out.
+
+#include "Decisions.h"
+
+#include <algorithm>
+#include <array>
+#include <memory>
+#include <optional>
+#include <unordered_map>
+#include <utility>
+
+#include "Check.h"
+#include "Digest.h"
+#include "Merge.h"
+#include "References.h"
+#include "ResultIndex.h"
+#include "RuleSupport.h"
+#include "Source.h"
+
+namespace migration {
+
+namespace {
+
+std::string keyOf(Kind kind, std::string_view nameOrOid) {
+  return static_cast<char>('0' + static_cast<int>(kind)) + folded(nameOrOid);
+}
+
+std::string placeOf(const Decision& decision) {
+  return decision.file + ":" + std::to_string(decision.line);
+}
+
+// The rows by what a decision may call their definitions: by OLD's names and OIDs, then NEW's, then
+// BASE's. A vendor extension also goes by the names of its attribute type.
+class RowIndex {
+ public:
+  explicit RowIndex(std::vector<Verdict>* rows) {
+    for (const auto side : {&MatchRow::old, &MatchRow::latest, &MatchRow::base}) {
+      for (std::size_t row = 0; row < rows->size(); ++row) {
+        add((*rows)[row].match, side, *rows, row);
+      }
+    }
+  }
+
+  std::optional<std::size_t> find(const Decision& decision) const {
+    const bool isByOid = !decision.oid.empty();
+    const auto& index = isByOid ? m_byOid : m_byName;
+    const auto found = index.find(keyOf(decision.kind, isByOid ? decision.oid : decision.name));
+    return found == index.end() ? std::nullopt : std::optional<std::size_t>(found->second);
+  }
+
+ private:
+  void add(const MatchRow& match, const Entry* MatchRow::*side, const std::vector<Verdict>& rows,
+           std::size_t row) {
+    const Entry* const entry = match.*side;
+    if (entry == nullptr) {
+      return;
+    }
+    m_byOid.emplace(keyOf(match.kind, oidOf(*entry)), row);
+    const Entry* const named = match.kind != Kind::kVendorExtension ? entry
+                               : match.attribute == kNoRow          ? nullptr
+                                                           : rows[match.attribute].match.*side;
+    if (named != nullptr) {
+      for (const std::string& name : named->kept->object->namesInPlace()) {
+        m_byName.emplace(keyOf(match.kind, name), row);
+      }
+    }
+  }
+
+  std::unordered_map<std::string, std::size_t> m_byOid;
+  std::unordered_map<std::string, std::size_t> m_byName;
+};
+
+// Makes two rows of one whose sides share the first name alone: a definition of the site's that
+// gets another name stands beside NEW's. Returns the row of the site's.
+std::size_t split(std::size_t row, std::vector<Verdict>* rows) {
+  const std::size_t own = rows->size();
+  rows->emplace_back();
+  Verdict& theirs = (*rows)[row];
+  Verdict& mine = rows->back();
+  mine.match = {theirs.kind(), nullptr, theirs.match.old, nullptr, theirs.match.attribute};
+  mine.change = theirs.change;
+  mine.outcome = Outcome::kUndecided;
+  mine.reason = theirs.reason;
+  theirs.match.old = nullptr;
+  theirs.outcome = Outcome::kNew;
+  theirs.result.reset();
+  theirs.clauses.clear();
+  for (std::size_t extension = 0; extension < own; ++extension) {
+    const MatchRow& match = (*rows)[extension].match;
+    if (match.kind == Kind::kVendorExtension && match.attribute == row && match.old != nullptr) {
+      const std::size_t ofMine = split(extension, rows);
+      (*rows)[ofMine].match.attribute = own;
+      break;
+    }
+  }
+  return own;
+}
+
+bool isToBeSplit(const Decision& decision, const Verdict& row) {
+  if (row.kind() == Kind::kVendorExtension || row.match.old == nullptr ||
+      row.match.latest == nullptr) {
+    return false;
+  }
+  return !decision.renumber.empty() ||
+         (!decision.rename.empty() && oidOf(*row.match.old) != oidOf(*row.match.latest));
+}
+
+bool decideAlike(const Decision& left, const Decision& right) {
+  return left.take == right.take && left.text == right.text && left.clauses == right.clauses &&
+         left.rename == right.rename && left.renumber == right.renumber;
+}
+
+// Reads the text of a decision: one whole definition of the kind, of which the reader loses
+// nothing. Returns what is wrong, or "".
+std::string readText(Kind kind, const std::string& text, Content* content) {
+  constexpr std::array<const char*, 3> kKeywords = {
+      "attributetypes=", "objectclasses=", "ORVAttributetypes="};
+  SchemaFile file;
+  file.name = "V3.user.at";
+  file.source =
+      std::make_unique<Source>("decision", kKeywords[static_cast<std::size_t>(kind)] + text + "\n");
+  file.written = std::make_unique<WrittenFile>(*file.source);
+  file.kept = std::make_unique<KeptFile>(*file.source);
+  Findings findings;
+  checkText(file, &findings);
+  for (const Finding& finding : findings) {
+    if (finding.severity == Severity::kError) {
+      return "its text: " + finding.text + " [" + finding.rule + "]";
+    }
+  }
+  const std::vector<KeptDefinition>& kept = file.kept->definitions();
+  const bool isOne = file.kept->ending() == ReadingEnd::kWhole && kept.size() == 1 &&
+                     file.written->definitions().size() == 1 && kept.front().kind == kind &&
+                     !kept.front().object->oidInPlace().empty();
+  if (!isOne) {
+    return "its text is not one whole " + std::string(nameOf(kind)) +
+           " from \"(\" to \")\" that the server's reader takes";
+  }
+  *content = contentOf(kept.front());
+  return "";
+}
+
+// The clause that a word means; EQUALITY, ORDERING, SUBSTR and SYNTAX of an attribute type are one.
+std::optional<Aspect> aspectOf(Kind kind, const std::string& word) {
+  for (const Aspect aspect : aspectsOf(kind)) {
+    if (nameOf(aspect) == word) {
+      return aspect;
+    }
+  }
+  const bool isMatching =
+      word == "SYNTAX" || word == "EQUALITY" || word == "ORDERING" || word == "SUBSTR";
+  return kind == Kind::kAttributeType && isMatching ? std::optional<Aspect>(Aspect::kMatching)
+                                                    : std::nullopt;
+}
+
+bool isList(Aspect aspect) {
+  return aspect == Aspect::kAliases || aspect == Aspect::kMust || aspect == Aspect::kMay ||
+         aspect == Aspect::kSup;
+}
+
+// Carries one decision out on its row. Every function returns what is wrong, or "".
+class Carrying {
+ public:
+  Carrying(const Decision& decision, Verdict* row) : m_decision(decision), m_row(*row) {}
+
+  std::string run() {
+    Verdict before = m_row;
+    std::string problem = decide();
+    if (!problem.empty()) {
+      m_row = std::move(before);
+      return problem;
+    }
+    m_row.decision = placeOf(m_decision);
+    return "";
+  }
+
+ private:
+  std::string decide() {
+    if (m_row.outcome == Outcome::kExcluded || m_row.outcome == Outcome::kWithdrawn) {
+      return "a list of OIDs leaves it out already";
+    }
+    const bool isByLatestOnly =
+        m_row.match.latest != nullptr && m_row.match.latest->file->name.rfind("V3.config.", 0) == 0;
+    if (isByLatestOnly && m_decision.take != Take::kNew) {
+      return "NEW has it only in a config file, which is carried over as it is: only \"new\" can "
+             "be taken";
+    }
+    if (!m_decision.text.empty()) {
+      return takeText();
+    }
+    if (!m_decision.clauses.empty()) {
+      return takeClauses();
+    }
+    const bool onlyIdentity = m_decision.take == Take::kNothing;
+    const std::string problem = onlyIdentity ? (m_row.isCarried() ? "" : takeOld()) : takeWhole();
+    return problem.empty() ? changeIdentity() : problem;
+  }
+
+  std::string takeWhole() {
+    switch (m_decision.take) {
+      case Take::kOld:
+        return takeOld();
+      case Take::kNew:
+        settle(m_row.match.latest == nullptr ? Outcome::kDropped : Outcome::kNew, std::nullopt);
+        return "";
+      case Take::kBase:
+        if (m_row.match.base == nullptr) {
+          return "BASE does not have it";
+        }
+        settle(Outcome::kText, contentOf(*m_row.match.base->kept));
+        return "";
+      case Take::kMerged:
+        return takeMerged();
+      case Take::kDrop:
+        settle(Outcome::kDropped, std::nullopt);
+        m_row.isTakenOut = true;
+        return "";
+      default:
+        return "";
+    }
+  }
+
+  std::string takeOld() {
+    if (m_row.match.old == nullptr) {
+      return "OLD does not have it";
+    }
+    settle(m_row.match.latest == nullptr ? Outcome::kAdded : Outcome::kOld,
+           contentOf(*m_row.match.old->kept));
+    return "";
+  }
+
+  std::string takeText() {
+    Content content;
+    std::string problem = readText(m_row.kind(), m_decision.text, &content);
+    if (!problem.empty()) {
+      return problem;
+    }
+    settle(Outcome::kText, std::move(content));
+    return changeIdentity();
+  }
+
+  std::string takeMerged() {
+    for (const ClauseChange& change : m_row.clauses) {
+      if (change.isInConflict && !isList(change.aspect)) {
+        return "it cannot be merged: " + std::string(nameOf(change.aspect)) +
+               " was changed in two ways; decide it by \"clauses\"";
+      }
+    }
+    return merge([](const ClauseChange& change) {
+      return change.isInConflict && isList(change.aspect)
+                 ? std::optional<Values>(unionOf(change.old, change.latest))
+                 : std::nullopt;
+    });
+  }
+
+  std::string takeClauses() {
+    std::unordered_map<int, Take> takes;
+    for (const auto& [word, take] : m_decision.clauses) {
+      const std::optional<Aspect> aspect = aspectOf(m_row.kind(), word);
+      if (!aspect) {
+        return word + " is no clause of " +
+               (m_row.kind() == Kind::kVendorExtension ? "a " : "an ") +
+               std::string(nameOf(m_row.kind()));
+      }
+      if (take == Take::kBase && m_row.match.base == nullptr) {
+        return "BASE does not have it";
+      }
+      if (take == Take::kUnion && !isList(*aspect)) {
+        return word + " is no list, and has no union";
+      }
+      const auto [place, isNew] = takes.emplace(static_cast<int>(*aspect), take);
+      if (!isNew && place->second != take) {
+        return word +
+               " goes together with the other matching rules and SYNTAX, which are taken "
+               "from another side";
+      }
+    }
+    return merge([&](const ClauseChange& change) -> std::optional<Values> {
+      const auto take = takes.find(static_cast<int>(change.aspect));
+      if (take == takes.end()) {
+        return std::nullopt;
+      }
+      switch (take->second) {
+        case Take::kOld:
+          return change.old;
+        case Take::kNew:
+          return change.latest;
+        case Take::kBase:
+          return change.base;
+        default:
+          return unionOf(change.old, change.latest);
+      }
+    });
+  }
+
+  // Merges, with the values that `decide` gives for clauses.
+  template <typename Decide>
+  std::string merge(Decide decide) {
+    const MatchRow& match = m_row.match;
+    if (match.old == nullptr || match.latest == nullptr) {
+      return "only what OLD and NEW both have can be merged";
+    }
+    const Content old = contentOf(*match.old->kept);
+    const Content latest = contentOf(*match.latest->kept);
+    Merge merged = match.base == nullptr
+                       ? mergeWithoutBase(old, latest, Prefer::kNothing)
+                       : mergeWithBase(contentOf(*match.base->kept), old, latest, Prefer::kNothing);
+    std::string open;
+    for (ClauseChange& change : merged.changes) {
+      if (std::optional<Values> value = decide(change)) {
+        merged.result[change.aspect] = *value;
+        change.result = std::move(*value);
+        change.isDecided = true;
+      }
+      if (!change.isDecided) {
+        open.append(open.empty() ? "" : ", ").append(nameOf(change.aspect));
+      }
+    }
+    if (!open.empty()) {
+      return "it leaves undecided: " + open;
+    }
+    if (merged.result[Aspect::kOid].empty()) {
+      return "it leaves the definition without an OID";
+    }
+    dropRepeated(&merged);
+    m_row.clauses = std::move(merged.changes);
+    const bool isOld = areEqual(merged.result, old) && merged.result.oid() == old.oid();
+    const bool isNew = areEqual(merged.result, latest) && merged.result.oid() == latest.oid();
+    settle(isOld   ? Outcome::kOld
+           : isNew ? Outcome::kNew
+                   : Outcome::kMerged,
+           isNew ? std::nullopt : std::optional<Content>(std::move(merged.result)));
+    return changeIdentity();
+  }
+
+  void settle(Outcome outcome, std::optional<Content> result) {
+    m_row.outcome = outcome;
+    m_row.result = std::move(result);
+    m_row.isTakenOut = false;
+    if (!m_decision.reason.empty()) {
+      m_row.notes.push_back("decided: " + m_decision.reason);
+    }
+  }
+
+  std::string changeIdentity() {
+    if (m_decision.rename.empty() && m_decision.renumber.empty()) {
+      return "";
+    }
+    if (!m_row.isCarried() || m_row.kind() == Kind::kVendorExtension) {
+      return "only a definition of the site's that stays can be renamed or renumbered";
+    }
+    if (!m_decision.rename.empty()) {
+      (*m_row.result)[Aspect::kFirstName] = {m_decision.rename};
+      dropAliasesOfNewName();
+    }
+    if (!m_decision.renumber.empty()) {
+      (*m_row.result)[Aspect::kOid] = {m_decision.renumber};
+    }
+    return "";
+  }
+
+  // An alias equal to the new first name goes.
+  void dropAliasesOfNewName() {
+    Values& aliases = (*m_row.result)[Aspect::kAliases];
+    aliases.erase(std::remove_if(aliases.begin(), aliases.end(),
+                                 [&](const std::string& alias) {
+                                   return equalFolded(alias, m_decision.rename);
+                                 }),
+                  aliases.end());
+  }
+
+  const Decision& m_decision;
+  Verdict& m_row;
+};
+
+// What the result would have twice because of a decision; empty when all is well.
+std::string clashOf(const ResultIndex& index, const Verdict& row) {
+  const auto told = [](const std::string& what, const Verdict& holder) {
+    return "its " + what + " would also be that of " + describe(holder);
+  };
+  if (!row.isCarried()) {
+    return "";
+  }
+  if (row.kind() == Kind::kVendorExtension) {
+    for (const std::string& name : dbNamesInResult(row)) {
+      if (const Verdict* const holder = index.byDbName(name, &row)) {
+        return told("DBNAME '" + name + "'", *holder);
+      }
+    }
+    return "";
+  }
+  if (const Verdict* const holder = index.byOid(row.result->oid(), &row)) {
+    return told("OID " + row.result->oid(), *holder);
+  }
+  for (const std::string& name : row.result->names()) {
+    if (const Verdict* const holder = index.byName(row.kind(), name, &row)) {
+      return told("name '" + name + "'", *holder);
+    }
+  }
+  return "";
+}
+
+class Applying {
+ public:
+  Applying(const std::vector<Decision>& decisions, std::vector<Verdict>* rows, Failures* failures)
+      : m_decisions(decisions), m_rows(*rows), m_index(rows), m_failures(*failures) {}
+
+  void run(bool allowUnused) {
+    splitRenamed();
+    for (const Decision& decision : m_decisions) {
+      const std::optional<std::size_t> row = m_index.find(decision);
+      if (row) {
+        carryOut(decision, *row);
+      } else if (!allowUnused) {
+        fail(decision,
+             "it matches no definition of BASE, OLD or NEW; remove it, or allow entries "
+             "that match nothing");
+      }
+    }
+    checkResult();
+    followIdentities();
+  }
+
+ private:
+  // A definition that gets a name or an OID of its own stands beside NEW's.
+  void splitRenamed() {
+    bool isSplit = false;
+    for (const Decision& decision : m_decisions) {
+      const std::optional<std::size_t> row = m_index.find(decision);
+      if (row && isToBeSplit(decision, m_rows[*row])) {
+        split(*row, &m_rows);
+        isSplit = true;
+      }
+    }
+    if (isSplit) {
+      m_index = RowIndex(&m_rows);
+    }
+  }
+
+  void fail(const Decision& decision, const std::string& text) {
+    m_failures.push_back({decision.file, decision.line, 1, "", text});
+  }
+
+  void carryOut(const Decision& decision, std::size_t row) {
+    const auto [made, isNew] = m_made.emplace(row, &decision);
+    const std::string who = "the decision about " + describe(m_rows[row]);
+    if (!isNew) {
+      if (!decideAlike(decision, *made->second)) {
+        fail(decision,
+             who + " contradicts the one at " + placeOf(*made->second) + "; keep one of them");
+      }
+      return;
+    }
+    if (!decision.fingerprint.empty() && decision.fingerprint != fingerprintOf(m_rows[row])) {
+      fail(decision, who +
+                         " is stale: the definition has changed since it was made; look at it "
+                         "again, and make it anew");
+      return;
+    }
+    const std::string problem = Carrying(decision, &m_rows[row]).run();
+    if (!problem.empty()) {
+      fail(decision, who + " cannot be carried out: " + problem);
+    }
+  }
+
+  // What is decided must not be twice in the result.
+  void checkResult() {
+    const ResultIndex index(m_rows, ResultIndex::Of::kAll);
+    for (const auto& [row, decision] : m_made) {
+      const std::string clash = clashOf(index, m_rows[row]);
+      if (!clash.empty() && !m_rows[row].decision.empty()) {
+        fail(*decision, "the decision about " + describe(m_rows[row]) + " cannot be carried out: " +
+                            clash + "; rename or renumber it, or take NEW's");
+      }
+    }
+  }
+
+  // References to what is renamed or renumbered follow.
+  void followIdentities() {
+    std::vector<Renaming> renamings;
+    for (const auto& [row, decision] : m_made) {
+      const Verdict& renamed = m_rows[row];
+      if (renamed.decision.empty() || renamed.match.old == nullptr || !renamed.isCarried()) {
+        continue;
+      }
+      const Values& names = renamed.match.old->kept->object->namesInPlace();
+      if (!decision->rename.empty() && !names.empty()) {
+        renamings.push_back({renamed.kind(), names.front(), decision->rename});
+      }
+      if (!decision->renumber.empty()) {
+        renamings.push_back({renamed.kind(), oidOf(*renamed.match.old), decision->renumber});
+      }
+    }
+    if (!renamings.empty()) {
+      replaceReferences(renamings, &m_rows);
+    }
+  }
+
+  const std::vector<Decision>& m_decisions;
+  std::vector<Verdict>& m_rows;
+  RowIndex m_index;
+  Failures& m_failures;
+  std::map<std::size_t, const Decision*> m_made;
+};
+
+}  // namespace
+
+std::string fingerprintOf(const Verdict& difference) {
+  std::string text;
+  for (const auto side : {&MatchRow::base, &MatchRow::old, &MatchRow::latest}) {
+    const Entry* const entry = difference.match.*side;
+    text += entry == nullptr ? "-" : textOf(contentOf(*entry->kept));
+    text += '\n';
+  }
+  return "sha256:" + sha256Of(text);
+}
+
+void applyDecisions(const std::vector<Decision>& decisions, bool allowUnused,
+                    std::vector<Verdict>* differences, Failures* failures) {
+  if (!decisions.empty()) {
+    Applying(decisions, differences, failures).run(allowUnused);
+  }
+}
+
+}  // namespace migration

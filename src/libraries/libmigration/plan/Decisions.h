@@ -1,0 +1,56 @@
+// What a person decided about definitions, as a decisions file says it, and what it makes of a
+// three-way comparison.
+
+#ifndef LIBSCHEMA_MIGRATION_DECISIONS_H
+#define LIBSCHEMA_MIGRATION_DECISIONS_H
+
+#include <cstddef>
+#include <cstdint>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "Finding.h"
+#include "Source.h"
+#include "Verdict.h"
+
+namespace migration {
+
+// Whose definition, or whose clause. Of a clause kUnion is NEW's members and then OLD's further
+// ones.
+enum class Take : std::uint8_t { kNothing, kOld, kNew, kBase, kMerged, kDrop, kUnion };
+
+struct Decision {
+  std::string file;
+  std::uint64_t line = 0;  // where its entry begins
+
+  Kind kind = Kind::kAttributeType;
+  std::string oid;          // one of these two names the definition, as BASE, OLD or NEW has it
+  std::string name;         // any letter case
+  std::string fingerprint;  // of the texts that it was made for; empty when it carries none
+
+  Take take = Take::kNothing;
+  std::string text;                     // "( 1.2.3 NAME 'a' … )"
+  std::map<std::string, Take> clauses;  // by the name of the clause, in capitals
+  std::string rename;                   // the first name, and
+  std::string renumber;                 // the OID that the site's definition gets
+  std::string reason;
+};
+
+// Reads a decisions file (TOML, a [[definition]] for each entry) and adds its entries to
+// *decisions. What is malformed is a failure at its line, and the entry is left out.
+void readDecisions(const Source& source, std::vector<Decision>* decisions, Failures* failures);
+
+// The fingerprint of a definition as BASE, OLD and NEW have it, in the order of the three: what the
+// readings keep, so that neither place nor layout matter.
+std::string fingerprintOf(const Verdict& difference);
+
+// Carries the decisions out on the differences. Entries that match nothing (unless that is
+// allowed), are stale, contradict another or cannot be carried out are failures, and change
+// nothing.
+void applyDecisions(const std::vector<Decision>& decisions, bool allowUnused,
+                    std::vector<Verdict>* differences, Failures* failures);
+
+}  // namespace migration
+
+#endif  // LIBSCHEMA_MIGRATION_DECISIONS_H

@@ -1,0 +1,219 @@
+#include "Execution.h"
+
+#include <libschema/SchemaManager.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <fstream>
+#include <iterator>
+#include <memory>
+#include <optional>
+#include <set>
+#include <system_error>
+#include <utility>
+
+#include "ResultIndex.h"
+#include "RuleSupport.h"
+#include "Staging.h"
+
+namespace migration {
+
+namespace {
+
+// Ends the execution, with what is to be told.
+struct Stop {
+  Failure failure;
+};
+
+[[noreturn]] void stop(const std::string& file, const std::string& text) {
+  throw Stop{{file, 0, 0, "", text}};
+}
+
+[[noreturn]] void stopSystem(const std::string& file, const std::string& text) {
+  const int error = errno;
+  stop(file, text + ": " + std::generic_category().message(error));
+}
+
+void writeText(const std::string& path, const std::string& bytes) {
+  std::ofstream out(path, std::ios::binary);
+  out << bytes;
+  out.close();
+  if (!out) {
+    stopSystem(path, "a private copy cannot be written");
+  }
+}
+
+std::string readText(const std::string& path) {
+  std::ifstream in(path, std::ios::binary);
+  if (!in.is_open()) {
+    stopSystem(path, "a private copy cannot be read");
+  }
+  std::string bytes((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+  if (in.bad()) {
+    stopSystem(path, "a private copy cannot be read");
+  }
+  return bytes;
+}
+
+void writeTexts(const std::string& folder, const std::vector<NamedText>& texts) {
+  for (const NamedText& text : texts) {
+    writeText(folder + "/" + text.name, text.bytes);
+  }
+}
+
+// The OIDs, as OLD has them, of what has this outcome.
+std::string listOf(const ThreeWay& threeWay, Outcome outcome) {
+  std::set<std::string> oids;
+  for (const Verdict& row : threeWay.differences) {
+    if (row.outcome == outcome && row.match.old != nullptr) {
+      oids.insert(oidOf(*row.match.old));
+    }
+  }
+  std::string text;
+  for (const std::string& oid : oids) {
+    text.append(oid).append("\n");
+  }
+  return text;
+}
+
+std::unique_ptr<SchemaManager> readAll(const std::string& folder,
+                                       const std::vector<NamedText>& texts) {
+  auto manager = std::make_unique<SchemaManager>(folder);
+  for (const char* const name : kSchemaFiles) {
+    const bool isThere = std::any_of(texts.begin(), texts.end(),
+                                     [&](const NamedText& text) { return text.name == name; });
+    if (isThere && manager->readFile(name) != 0) {
+      stop(folder + "/" + name, "the library cannot read the private copy");
+    }
+  }
+  return manager;
+}
+
+bool isConfigFile(const std::string& name) { return name.rfind("V3.config.", 0) == 0; }
+
+// What a manager writes of the seven files that have a set.
+std::vector<NamedText> writeAll(SchemaManager* manager, const std::string& folder) {
+  std::vector<NamedText> texts;
+  for (const char* const file : kSchemaFiles) {
+    if (isConfigFile(file)) {
+      continue;
+    }
+    if (manager->writeFile(folder, file) != 0) {
+      stop(folder + "/" + file, "the library cannot write it");
+    }
+    texts.push_back({file, readText(folder + "/" + file)});
+  }
+  return texts;
+}
+
+// The lines below the header, which holds the time.
+std::string_view definitionsOf(const NamedText& text) {
+  const std::string_view bytes = text.bytes;
+  const std::size_t end = bytes.find('\n');
+  return end == std::string_view::npos ? bytes : bytes.substr(end + 1);
+}
+
+std::vector<NamedText> mergeByLibrary(const ThreeWayRequest& request, const ThreeWay& threeWay,
+                                      const std::string& directory) {
+  const StagedTexts staged = stage(request, threeWay);
+  const std::string oldFolder = directory + "/old";
+  const std::string newFolder = directory + "/new";
+  writeTexts(oldFolder, staged.old);
+  writeTexts(newFolder, staged.latest);
+  writeText(oldFolder + "/excluded", listOf(threeWay, Outcome::kExcluded));
+  writeText(oldFolder + "/withdrawn", listOf(threeWay, Outcome::kWithdrawn));
+  std::unique_ptr<SchemaManager> old = readAll(oldFolder, staged.old);
+  std::unique_ptr<SchemaManager> latest = readAll(newFolder, staged.latest);
+  if (old->modifySchema(oldFolder + "/withdrawn") != 0 ||
+      old->readExcludedOids(oldFolder + "/excluded") != 0) {
+    stop(oldFolder, "the library cannot read the lists");
+  }
+  old->compSchemas(latest.get());
+  if (!latest->mergeSchemas(old.get())) {
+    // Both hold the same definitions now, and must not both be destroyed.
+    static_cast<void>(old.release());
+    stop(newFolder, "the library cannot merge: a definition belongs to no file");
+  }
+  return writeAll(latest.get(), directory + "/merged");
+}
+
+// Both layouts must be one and the same to the library.
+void proveAlike(const std::vector<NamedText>& merged, const std::vector<NamedText>& inNewsLayout,
+                const std::string& directory) {
+  const std::string folder = directory + "/kept";
+  writeTexts(folder, inNewsLayout);
+  const std::unique_ptr<SchemaManager> kept = readAll(folder, inNewsLayout);
+  const std::vector<NamedText> written = writeAll(kept.get(), directory + "/kept-written");
+  for (std::size_t file = 0; file < merged.size(); ++file) {
+    if (definitionsOf(merged[file]) != definitionsOf(written[file])) {
+      stop(merged[file].name,
+           "what the library's merge comes to is not what the planned files hold");
+    }
+  }
+}
+
+std::string idOf(const Verdict& row) {
+  return static_cast<char>('0' + static_cast<int>(row.kind())) + oidInResult(row);
+}
+
+}  // namespace
+
+Failures differencesFromPlan(const ThreeWay& threeWay, const Installation& result) {
+  Failures failures;
+  std::set<std::string> planned;
+  for (const Verdict& row : threeWay.differences) {
+    if (!row.isInResult()) {
+      continue;
+    }
+    planned.insert(idOf(row));
+    const Entry* const entry = result.byOid(row.kind(), oidInResult(row));
+    const Content wanted = row.isCarried() ? *row.result : contentOf(*row.match.latest->kept);
+    if (entry == nullptr || contentOf(*entry->kept).values != wanted.values) {
+      failures.push_back({result.directory(), 0, 0, "",
+                          describe(row) + (entry == nullptr ? " is not in the result"
+                                                            : " is not what was planned")});
+    }
+  }
+  for (const Entry& entry : result.entries()) {
+    const std::string id = static_cast<char>('0' + static_cast<int>(entry.kind())) + oidOf(entry);
+    if (planned.count(id) == 0) {
+      failures.push_back({entry.file->name, entry.place().line, entry.place().column, "",
+                          describe(*entry.kept) + " is in the result, and was not planned"});
+    }
+  }
+  return failures;
+}
+
+namespace {
+
+Failures compareWithPlan(const ThreeWay& threeWay, const std::vector<NamedText>& texts) {
+  Failures failures;
+  const Installation result = Installation::fromTexts("result", texts, ReadLimits(), &failures);
+  const Failures found = differencesFromPlan(threeWay, result);
+  failures.insert(failures.end(), found.begin(), found.end());
+  return failures;
+}
+
+}  // namespace
+
+Execution execute(const ThreeWayRequest& request, const ThreeWay& threeWay,
+                  const std::string& directory) {
+  Execution execution;
+  try {
+    execution.inNewsLayout = inNewsLayout(request, threeWay);
+    execution.inLibraryLayout = mergeByLibrary(request, threeWay, directory);
+    proveAlike(execution.inLibraryLayout, execution.inNewsLayout, directory);
+    for (const SchemaFile& file : request.latest->files()) {
+      if (isConfigFile(file.name)) {
+        execution.inLibraryLayout.push_back({file.name, std::string(file.source->bytes())});
+      }
+    }
+    execution.failures = compareWithPlan(threeWay, execution.inNewsLayout);
+    execution.notCarriedByLibrary = compareWithPlan(threeWay, execution.inLibraryLayout);
+  } catch (const Stop& stopped) {
+    execution.failures.push_back(stopped.failure);
+  }
+  return execution;
+}
+
+}  // namespace migration

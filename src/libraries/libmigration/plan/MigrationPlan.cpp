@@ -1,0 +1,226 @@
+#include "MigrationPlan.h"
+
+#include <algorithm>
+#include <map>
+#include <set>
+#include <utility>
+
+#include "Check.h"
+#include "Decisions.h"
+#include "Digest.h"
+#include "InputFiles.h"
+#include "OidList.h"
+#include "Staging.h"
+
+namespace migration {
+
+namespace {
+
+class PlanMaker {
+ public:
+  explicit PlanMaker(const PlanRequest& request)
+      : m_request(request), m_plan(std::make_unique<MigrationPlan>()) {}
+
+  std::unique_ptr<MigrationPlan> make() {
+    readInputs();
+    if (!m_plan->failures.empty()) {
+      return std::move(m_plan);
+    }
+    checkInputs();
+    m_plan->threeWay = compareThreeWay(m_plan->request);
+    takeDecisionFailures();
+    doubtBase();
+    m_plan->undecidedCount = static_cast<std::size_t>(
+        std::count_if(m_plan->threeWay.differences.begin(), m_plan->threeWay.differences.end(),
+                      [](const Verdict& row) { return row.isUndecided(); }));
+    checkResult();
+    return std::move(m_plan);
+  }
+
+ private:
+  // ---- Inputs ----
+
+  void readInputs() {
+    if (!m_request.base.empty()) {
+      m_plan->base = readInstallation("base", m_request.base);
+      m_plan->request.base = &*m_plan->base;
+    }
+    m_plan->old = readInstallation("old", m_request.old);
+    m_plan->latest = readInstallation("new", m_request.latest);
+    m_plan->request.old = &*m_plan->old;
+    m_plan->request.latest = &*m_plan->latest;
+    m_plan->request.prefer = m_request.prefer;
+    m_plan->request.allowUnused = m_request.allowUnused;
+    for (const std::string& path : m_request.excludeLists) {
+      m_excludeLists.push_back(readList("exclude", path, &m_plan->request.excluded));
+    }
+    if (!m_request.withdrawList.empty()) {
+      m_withdrawList = readList("withdraw", m_request.withdrawList, &m_plan->request.withdrawn);
+    }
+    for (const std::string& path : m_request.decisions) {
+      if (const Source* const source = readFile("decisions", path)) {
+        readDecisions(*source, &m_plan->request.decisions, &m_plan->failures);
+      }
+    }
+  }
+
+  std::optional<Installation> readInstallation(const char* role, const std::string& directory) {
+    Installation installation =
+        Installation::fromDirectory(directory, m_request.limits, &m_plan->failures);
+    for (const SchemaFile& file : installation.files()) {
+      note(role, *file.source);
+      if (file.kept->ending() == ReadingEnd::kNeverEnds) {
+        failAt(file, "the server's library would never come to the end of this file");
+      } else if (file.kept->ending() == ReadingEnd::kFails) {
+        failAt(file, "the server's library fails to read this file");
+      }
+    }
+    return installation;
+  }
+
+  void failAt(const SchemaFile& file, const std::string& text) {
+    const Place place = file.source->placeOf(file.kept->endOffset());
+    m_plan->failures.push_back(
+        {file.source->path(), place.line, place.column, "", text + "; check tells what is wrong"});
+  }
+
+  const Source* readFile(const char* role, const std::string& path) {
+    std::unique_ptr<Source> source = readSource(path, m_request.limits.bytes, &m_plan->failures);
+    if (source == nullptr) {
+      return nullptr;
+    }
+    note(role, *source);
+    m_plan->lists.push_back(std::move(source));
+    return m_plan->lists.back().get();
+  }
+
+  const Source* readList(const char* role, const std::string& path, std::set<std::string>* oids) {
+    const Source* const source = readFile(role, path);
+    if (source != nullptr) {
+      for (const OidWord& word : readOidList(*source)) {
+        if (word.use == WordUse::kTaken) {
+          oids->emplace(word.text);
+        }
+      }
+    }
+    return source;
+  }
+
+  void note(const char* role, const Source& source) {
+    m_plan->inputs.push_back({role, source.path(), sha256Of(source.bytes())});
+  }
+
+  // ---- Findings ----
+
+  Findings checked(const Installation& installation) const {
+    CheckRequest request;
+    request.installation = &installation;
+    return check(request);
+  }
+
+  void checkInputs() {
+    if (m_plan->base) {
+      add(checked(*m_plan->base));
+    }
+    CheckRequest request;
+    request.installation = &*m_plan->old;
+    request.against = &*m_plan->latest;
+    request.excludeLists = m_excludeLists;
+    request.withdrawList = m_withdrawList;
+    countAndAdd(check(request));
+    countAndAdd(checked(*m_plan->latest));
+  }
+
+  void add(Findings findings) {
+    for (Finding& finding : findings) {
+      refuseLoss(finding);
+      m_plan->ofInputs.push_back(std::move(finding));
+    }
+  }
+
+  // The result may have what OLD or NEW has.
+  void countAndAdd(Findings findings) {
+    std::map<std::string, std::size_t> counts;
+    for (const Finding& finding : findings) {
+      ++counts[keyOf(finding)];
+    }
+    for (const auto& [key, count] : counts) {
+      std::size_t& known = m_known[key];
+      known = std::max(known, count);
+    }
+    add(std::move(findings));
+  }
+
+  static std::string keyOf(const Finding& finding) { return finding.rule + finding.definition; }
+
+  // What the library's reading loses must not get lost unseen.
+  void refuseLoss(const Finding& finding) {
+    const bool isLoss = finding.rule.front() == 'L' || finding.rule.front() == 'D';
+    if (isLoss && finding.severity == Severity::kError) {
+      m_plan->refusals.push_back(
+          {finding.file, finding.line, finding.column, finding.rule, finding.text});
+    }
+  }
+
+  // A reference that dangles, a name that is another one's now, two definitions with one name: what
+  // only warns about a habit of writing breaks nothing.
+  static bool isBroken(const Finding& finding) {
+    const bool isHarmless = finding.rule == "R405" || finding.rule == "T305" ||
+                            finding.rule == "T306" || finding.rule == "T307";
+    const char family = finding.rule.front();
+    return finding.severity == Severity::kError ||
+           ((family == 'T' || family == 'R' || family == 'V') && !isHarmless);
+  }
+
+  void checkResult() {
+    m_plan->resultTexts = inNewsLayout(m_plan->request, m_plan->threeWay);
+    m_plan->result =
+        Installation::fromTexts("result", m_plan->resultTexts, m_request.limits, &m_plan->refusals);
+    std::map<std::string, std::size_t> seen;
+    for (Finding& finding : checked(*m_plan->result)) {
+      if (++seen[keyOf(finding)] <= m_known[keyOf(finding)] || !isBroken(finding)) {
+        continue;
+      }
+      finding.severity = Severity::kError;
+      m_plan->refusals.push_back({finding.file, finding.line, finding.column, finding.rule,
+                                  finding.text + " (new in this result)"});
+      m_plan->newInResult.push_back(std::move(finding));
+    }
+  }
+
+  // ---- The comparison ----
+
+  void takeDecisionFailures() {
+    Failures& failures = m_plan->threeWay.failures;
+    m_plan->refusals.insert(m_plan->refusals.end(), failures.begin(), failures.end());
+  }
+
+  void doubtBase() {
+    const std::string& equal = m_plan->threeWay.suspiciousBase;
+    if (equal.empty() || m_request.acceptBase) {
+      return;
+    }
+    const std::string what = equal == "OLD" ? "the site has changed nothing, and all that it has "
+                                              "beside the release is taken for the release's own"
+                                            : "the release has changed nothing";
+    m_plan->refusals.insert(
+        m_plan->refusals.begin(),
+        {m_request.base, 0, 0, "",
+         "BASE equals " + equal + " definition by definition, while OLD and NEW differ: then " +
+             what + "; if that is meant, give --accept-base"});
+  }
+
+  const PlanRequest& m_request;
+  std::unique_ptr<MigrationPlan> m_plan;
+  std::vector<const Source*> m_excludeLists;
+  const Source* m_withdrawList = nullptr;
+  std::map<std::string, std::size_t> m_known;
+};
+
+}  // namespace
+
+std::unique_ptr<MigrationPlan> makePlan(const PlanRequest& request) {
+  return PlanMaker(request).make();
+}
+
+}  // namespace migration

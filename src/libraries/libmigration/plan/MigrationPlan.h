@@ -1,0 +1,75 @@
+// Everything that is to be known before a migration: the inputs with their digests, what comes of
+// every definition, what the rules say of the inputs and of the result, and why it must not go
+// ahead.
+
+#ifndef LIBSCHEMA_MIGRATION_MIGRATION_PLAN_H
+#define LIBSCHEMA_MIGRATION_MIGRATION_PLAN_H
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "Finding.h"
+#include "Installation.h"
+#include "ThreeWay.h"
+
+namespace migration {
+
+struct PlanRequest {
+  std::string base;  // directories; empty for no BASE
+  std::string old;
+  std::string latest;  // NEW
+  std::vector<std::string> excludeLists;
+  std::string withdrawList;  // empty without one
+  std::vector<std::string> decisions;
+  Prefer prefer = Prefer::kNothing;
+  bool allowUnused = false;  // decisions that match nothing
+  bool acceptBase = false;   // a BASE that equals OLD, or NEW
+  ReadLimits limits;
+};
+
+// A file that the plan was made from.
+struct PlanInput {
+  std::string role;  // "base", "old", "new", "exclude", "withdraw", "decisions"
+  std::string path;
+  std::string sha256;
+};
+
+struct MigrationPlan {
+  std::vector<PlanInput> inputs;
+  ThreeWay threeWay;
+
+  // What the rules say of BASE, OLD and NEW, of the lists, and of the result what neither OLD nor
+  // NEW had.
+  Findings ofInputs;
+  Findings newInResult;
+
+  // Inputs that cannot be had or read; nothing else means anything then.
+  Failures failures;
+  // Why the migration must not go ahead, beside what is undecided.
+  Failures refusals;
+  std::size_t undecidedCount = 0;
+
+  bool isReady() const { return failures.empty() && refusals.empty() && undecidedCount == 0; }
+
+  // What everything above refers to.
+  ThreeWayRequest request;
+  std::optional<Installation> base;
+  std::optional<Installation> old;
+  std::optional<Installation> latest;
+  std::vector<std::unique_ptr<Source>> lists;
+
+  // The result in NEW's layout, as it stands with what is undecided left at NEW's.
+  std::vector<NamedText> resultTexts;
+  std::optional<Installation> result;
+};
+
+// Works the plan out. Nothing is written.
+std::unique_ptr<MigrationPlan> makePlan(const PlanRequest& request);
+
+}  // namespace migration
+
+#endif  // LIBSCHEMA_MIGRATION_MIGRATION_PLAN_H

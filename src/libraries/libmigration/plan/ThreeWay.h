@@ -1,0 +1,77 @@
+// The three-way comparison of installations: every definition of BASE, OLD and NEW with who changed
+// it and what is to come of it. Nothing is changed by it. Without BASE nobody can tell who changed
+// what: then every definition that is not the same is unknown.
+
+#ifndef LIBSCHEMA_MIGRATION_THREE_WAY_H
+#define LIBSCHEMA_MIGRATION_THREE_WAY_H
+
+#include <set>
+#include <string>
+#include <vector>
+
+#include "Decisions.h"
+#include "Installation.h"
+#include "Verdict.h"
+
+namespace migration {
+
+struct ThreeWayRequest {
+  const Installation* base = nullptr;  // null without one
+  const Installation* old = nullptr;
+  const Installation* latest = nullptr;  // NEW
+  std::set<std::string> excluded;        // OIDs as OLD has them
+  std::set<std::string> withdrawn;
+  Prefer prefer = Prefer::kNothing;
+  std::vector<Decision> decisions;
+  bool allowUnused = false;  // decisions that match nothing
+};
+
+struct ThreeWay {
+  // What NEW has in its order, and behind it what only OLD, and then only BASE, has; attribute
+  // types, object classes, vendor extensions. They refer to the installations.
+  std::vector<Verdict> differences;
+
+  // "OLD" or "NEW" when BASE equals that one definition by definition while OLD and NEW differ:
+  // often a wrong argument. Empty otherwise.
+  std::string suspiciousBase;
+
+  // Decisions that could not be carried out.
+  Failures failures;
+};
+
+ThreeWay compareThreeWay(const ThreeWayRequest& request);
+
+// ---- Its steps, in their order ----
+
+// Who changed it and what comes of it, each definition for itself.
+void classify(const ThreeWayRequest& request, std::vector<Verdict>* differences);
+
+// What OLD brings with an OID, a name or a DBNAME that NEW gives to another definition, which keeps
+// it in the result, is taken.
+void findTaken(std::vector<Verdict>* differences);
+class ResultIndex;
+// Marks one definition so, and tells whether it did; `index` has what NEW gives.
+bool markIfTaken(const ResultIndex& index, Verdict* difference);
+
+// What the lists name is left out.
+void applyLists(const ThreeWayRequest& request, std::vector<Verdict>* differences);
+
+// Decides the clauses in conflict of what OLD and NEW both have under one OID.
+void applyPreference(const ThreeWayRequest& request, std::vector<Verdict>* differences);
+
+// Vendor extensions go with an attribute type that OLD or NEW lacks, or that is taken.
+void joinExtensions(std::vector<Verdict>* differences);
+
+// The vendor extensions that come with what is kept may have a DBNAME that is taken.
+void findTakenOfKept(std::vector<Verdict>* differences);
+
+// Vendor extensions have the OID that their attribute type has in the result.
+void followOids(std::vector<Verdict>* differences);
+
+// What the release removed is kept where something of the site's that stays refers to it, and
+// references to what the release renamed follow.
+void settleReferences(std::vector<Verdict>* differences);
+
+}  // namespace migration
+
+#endif  // LIBSCHEMA_MIGRATION_THREE_WAY_H

@@ -1,0 +1,44 @@
+#include "Verdict.h"
+
+#include <algorithm>
+#include <array>
+
+namespace migration {
+
+std::string nameOf(Change change) {
+  constexpr std::array<const char*, 11> kNames = {"same",
+                                                  "added by site",
+                                                  "removed by site",
+                                                  "changed by site",
+                                                  "added by release",
+                                                  "removed by release",
+                                                  "changed by release",
+                                                  "changed by both, mergeable",
+                                                  "changed by both, in conflict",
+                                                  "taken",
+                                                  "unknown"};
+  return kNames[static_cast<std::size_t>(change)];
+}
+
+std::string wordOf(Change change) {
+  std::string word = nameOf(change);
+  word.erase(std::remove(word.begin(), word.end(), ','), word.end());
+  std::replace(word.begin(), word.end(), ' ', '-');
+  return word;
+}
+
+std::string_view wordOf(Outcome outcome) {
+  constexpr std::array<std::string_view, 12> kWords = {
+      "old",     "new",  "same",     "merged",    "added", "kept",
+      "dropped", "gone", "excluded", "withdrawn", "text",  "undecided"};
+  return kWords[static_cast<std::size_t>(outcome)];
+}
+
+const Entry& Verdict::entry() const {
+  const Entry* const newer = match.old != nullptr ? match.old : match.latest;
+  return newer != nullptr ? *newer : *match.base;
+}
+
+std::string describe(const Verdict& difference) { return describe(*difference.entry().kept); }
+
+}  // namespace migration

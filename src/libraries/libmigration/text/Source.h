@@ -1,0 +1,52 @@
+// The bytes of one file, read once, and the places in them. Everything that is read from it refers
+// to its bytes: a source stays in place, unchanged, as long as anything refers to it.
+
+#ifndef LIBSCHEMA_MIGRATION_SOURCE_H
+#define LIBSCHEMA_MIGRATION_SOURCE_H
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace migration {
+
+// A place in a file: line and column count from 1, columns in bytes.
+struct Place {
+  std::uint64_t line = 1;
+  std::uint64_t column = 1;
+};
+
+inline bool operator==(const Place& left, const Place& right) {
+  return left.line == right.line && left.column == right.column;
+}
+
+class Source {
+ public:
+  // `path` is the name that messages show, `bytes` the whole content. No file is touched.
+  Source(std::string path, std::string bytes);
+  Source(const Source&) = delete;
+  Source& operator=(const Source&) = delete;
+
+  const std::string& path() const { return m_path; }
+  std::string_view bytes() const { return m_bytes; }
+
+  // The place of the byte at `offset`; the place behind the last byte for an offset that is larger.
+  Place placeOf(std::size_t offset) const;
+
+  // The line that holds the byte at `offset`, without its line end.
+  std::string_view lineAt(std::size_t offset) const;
+
+  // The line of this number, from 1, without its line end; empty when there is none.
+  std::string_view line(std::uint64_t number) const;
+
+ private:
+  std::string m_path;
+  std::string m_bytes;
+  std::vector<std::size_t> m_lineStarts;
+};
+
+}  // namespace migration
+
+#endif  // LIBSCHEMA_MIGRATION_SOURCE_H

@@ -1,0 +1,37 @@
+// A command of the program: what it takes from the command line, and what it does. It calls the
+// libraries, lets a report be rendered, and says how the run ends.
+
+#ifndef SCHEMA_MIGRATE_COMMAND_H
+#define SCHEMA_MIGRATE_COMMAND_H
+
+#include <memory>
+
+#include "Console.h"
+
+namespace CLI {
+class App;
+}
+
+class Command {
+ public:
+  Command() = default;
+  Command(const Command&) = delete;
+  Command& operator=(const Command&) = delete;
+  virtual ~Command() = default;
+
+  // Adds the subcommand with its options, which refer to this object, and returns it.
+  virtual CLI::App* declare(CLI::App* program) = 0;
+
+  // Returns the exit code, or throws a Failure.
+  virtual int run(Console* console) = 0;
+};
+
+// Each of the commands.
+std::unique_ptr<Command> makeCheckCommand();
+std::unique_ptr<Command> makeDiffCommand();
+std::unique_ptr<Command> makeExplainCommand();
+std::unique_ptr<Command> makeMigrateCommand();
+std::unique_ptr<Command> makePlanCommand();
+std::unique_ptr<Command> makeShowCommand();
+
+#endif  // SCHEMA_MIGRATE_COMMAND_H

@@ -1,0 +1,154 @@
+#include "CommandLine.h"
+
+#include <algorithm>
+#include <iostream>
+
+#include "Messages.h"
+
+namespace {
+
+constexpr char kVersion[] = "schema-migrate " SCHEMA_MIGRATE_VERSION;
+
+constexpr char kDescription[] =
+    R"(Checks and shows the schema of a directory server, and carries that of an old
+installation over to a new release.)";
+
+constexpr char kFooter[] = R"(schema-migrate COMMAND --help tells more about a command.
+
+Example:
+  schema-migrate check /srv/ldap-old/schema
+  schema-migrate migrate --from /srv/ldap-old/schema --to /srv/ldap-new/schema \
+      --out /srv/migrated-schema
+
+Exit codes:
+  0  done
+  1  check has findings, diff shows differences, or show does not know a name
+  2  the command line is wrong
+  3  an input is missing, unreadable, too large or cannot be parsed
+  4  refused: a definition cannot be migrated, or is undecided; nothing was written
+  5  writing or verification failed
+
+Manual: man schema-migrate)";
+
+int usageError(const std::string& text, const std::string& command) {
+  std::cerr << errorLine(text + "; schema-migrate " + command + "--help tells how it is used");
+  return kUsage;
+}
+
+// An option with "=" and nothing behind it. The parser takes it for one without a value, and then
+// the next word for the value.
+std::string emptyOption(int argc, char** argv) {
+  for (int i = 1; i < argc; ++i) {
+    const std::string word = argv[i];
+    if (word == "--") {
+      break;
+    }
+    if (word.size() > 3 && word.compare(0, 2, "--") == 0 && word.find('=') == word.size() - 1) {
+      return word.substr(0, word.size() - 1);
+    }
+  }
+  return "";
+}
+
+// The commands on a command line with the program's own help and version.
+class Program {
+ public:
+  explicit Program(const Commands& commands) : m_program(kDescription, "schema-migrate") {
+    m_program.footer(kFooter);
+    m_program.set_help_flag("-h,--help", "print this help");
+    m_program.set_version_flag("--version", kVersion, "print the version");
+    m_program.require_subcommand(1);
+    for (const auto& command : commands) {
+      CLI::App* const declared = command->declare(&m_program);
+      declared->set_help_flag("-h,--help", "print this help");
+      m_declared.emplace_back(declared, command.get());
+    }
+  }
+
+  Command* parse(int argc, char** argv, int* exitCode) {
+    if (const std::string option = emptyOption(argc, argv); !option.empty()) {
+      *exitCode = usageError(option + ": the name is empty", commandNamed(argv[1]));
+      return nullptr;
+    }
+    try {
+      m_program.parse(argc, argv);
+      return chosen()->second;
+    } catch (const CLI::Success& printed) {
+      *exitCode = m_program.exit(printed);
+    } catch (const CLI::ParseError& error) {
+      const auto command = chosen();
+      *exitCode = usageError(error.what(),
+                             command == m_declared.end() ? "" : command->first->get_name() + " ");
+    }
+    return nullptr;
+  }
+
+ private:
+  using Declared = std::vector<std::pair<CLI::App*, Command*>>;
+
+  Declared::const_iterator chosen() const {
+    return std::find_if(m_declared.begin(), m_declared.end(),
+                        [&](const auto& each) { return m_program.got_subcommand(each.first); });
+  }
+
+  // "check " when that is a command, otherwise nothing.
+  std::string commandNamed(const std::string& word) const {
+    const bool isCommand = std::any_of(m_declared.begin(), m_declared.end(), [&](const auto& each) {
+      return each.first->get_name() == word;
+    });
+    return isCommand ? word + " " : "";
+  }
+
+  CLI::App m_program;
+  Declared m_declared;
+};
+
+}  // namespace
+
+Commands allCommands() {
+  Commands commands;
+  commands.push_back(makeCheckCommand());
+  commands.push_back(makeDiffCommand());
+  commands.push_back(makeExplainCommand());
+  commands.push_back(makeMigrateCommand());
+  commands.push_back(makePlanCommand());
+  commands.push_back(makeShowCommand());
+  return commands;
+}
+
+Command* parseCommandLine(int argc, char** argv, const Commands& commands, int* exitCode) {
+  return Program(commands).parse(argc, argv, exitCode);
+}
+
+CLI::Option* addList(CLI::App* command, const std::string& name, std::vector<std::string>* values,
+                     const std::string& type, const std::string& description) {
+  return command->add_option(name, *values, description + "; may be given more than once")
+      ->type_name(type)
+      ->type_size(1)
+      ->allow_extra_args(false);
+}
+
+CLI::Validator notEmpty() {
+  return {[](const std::string& value) {
+            return value.empty() ? std::string("the name is empty") : std::string();
+          },
+          ""};
+}
+
+CLI::Validator oneOf(std::initializer_list<const char*> words) {
+  const std::vector<std::string> allowed(words.begin(), words.end());
+  return {[allowed](const std::string& value) {
+            if (std::find(allowed.begin(), allowed.end(), value) != allowed.end()) {
+              return std::string();
+            }
+            std::string text = "must be";
+            for (const std::string& word : allowed) {
+              text += (&word == &allowed.front()  ? " "
+                       : &word == &allowed.back() ? " or "
+                                                  : ", ") +
+                      word;
+            }
+            return text;
+          },
+          ""};
+}

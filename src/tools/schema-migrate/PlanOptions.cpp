@@ -1,0 +1,67 @@
+#include "PlanOptions.h"
+
+#include "CommandLine.h"
+#include "Messages.h"
+
+void PlanOptions::declareInputs(CLI::App* command) {
+  command->add_option("--from", request.old, "directory with the old installation's V3.* files")
+      ->required()
+      ->check(notEmpty())
+      ->type_name("OLD");
+  command->add_option("--to", request.latest, "directory with the new release's V3.* files")
+      ->required()
+      ->check(notEmpty())
+      ->type_name("NEW");
+  command
+      ->add_option("--base", request.base,
+                   "directory with the V3.* files of the old release as it was shipped")
+      ->check(notEmpty())
+      ->type_name("BASE");
+  command->add_flag("--accept-base", request.acceptBase,
+                    "BASE may equal OLD or NEW, as that of an installation never customised does");
+}
+
+void PlanOptions::declareDecisions(CLI::App* command) {
+  addList(command, "--exclude-oids", &request.excludeLists, "FILE",
+          "list of OIDs that are not carried over")
+      ->check(notEmpty());
+  command->add_option("--withdraw", request.withdrawList, "list of OIDs that OLD takes back")
+      ->check(notEmpty())
+      ->type_name("FILE");
+  addList(command, "--decisions", &request.decisions, "FILE", "what was decided about definitions")
+      ->check(notEmpty());
+  command->add_flag("--allow-unused", request.allowUnused,
+                    "decisions may be about definitions that none of the three has");
+  command
+      ->add_option("--prefer", m_prefer, "decide clauses that were changed in two ways: old or new")
+      ->check(oneOf({"old", "new"}))
+      ->type_name("SIDE");
+}
+
+bool PlanOptions::hasBaseOrDecisions() const {
+  return !request.base.empty() || !request.decisions.empty() || !m_prefer.empty();
+}
+
+std::unique_ptr<migration::MigrationPlan> PlanOptions::makePlan() const {
+  migration::PlanRequest wanted = request;
+  wanted.prefer = m_prefer == "old"   ? migration::Prefer::kOld
+                  : m_prefer == "new" ? migration::Prefer::kNew
+                                      : migration::Prefer::kNothing;
+  std::unique_ptr<migration::MigrationPlan> plan = migration::makePlan(wanted);
+  if (!plan->failures.empty()) {
+    std::string lines;
+    for (const migration::Failure& failure : plan->failures) {
+      lines += failure.line == 0
+                   ? errorLine(failure.file, failure.text)
+                   : errorLine(placeOf(failure.file, {failure.line, failure.column}), failure.text);
+    }
+    throw Failure(kBadInput, lines);
+  }
+  // Told first, and alone: everything else would be told of the wrong thing.
+  const std::string& equal = plan->threeWay.suspiciousBase;
+  if (!equal.empty() && !request.acceptBase) {
+    const migration::Failure& doubt = plan->refusals.front();
+    throw Failure(kRefused, errorLine(doubt.file, doubt.text));
+  }
+  return plan;
+}

@@ -1,0 +1,29 @@
+// The options that `diff`, `plan` and `migrate` have in common: what a plan is made from.
+
+#ifndef SCHEMA_MIGRATE_PLAN_OPTIONS_H
+#define SCHEMA_MIGRATE_PLAN_OPTIONS_H
+
+#include <libschema-migration/MigrationPlan.h>
+
+#include <CLI/CLI.hpp>
+#include <memory>
+#include <string>
+
+class PlanOptions {
+ public:
+  // Adds them to a command; they refer to this object.
+  void declareInputs(CLI::App* command);
+  void declareDecisions(CLI::App* command);
+
+  bool hasBaseOrDecisions() const;
+
+  // Reads the inputs and works the plan out. Throws a Failure when an input cannot be had.
+  std::unique_ptr<migration::MigrationPlan> makePlan() const;
+
+  migration::PlanRequest request;
+
+ private:
+  std::string m_prefer;
+};
+
+#endif  // SCHEMA_MIGRATE_PLAN_OPTIONS_H

@@ -1,0 +1,234 @@
+#include "PlanReport.h"
+
+#include <libschema-migration/Content.h>
+#include <libschema-migration/Verdict.h>
+
+#include <algorithm>
+#include <map>
+
+#include "Messages.h"
+
+namespace {
+
+using migration::Aspect;
+using migration::ClauseChange;
+using migration::Entry;
+using migration::MigrationPlan;
+using migration::Verdict;
+
+bool contains(const std::vector<std::string>& words, std::string_view word) {
+  return std::any_of(words.begin(), words.end(),
+                     [&](const std::string& each) { return migration::equalFolded(each, word); });
+}
+
+bool isNamed(const Verdict& row, const std::vector<std::string>& names) {
+  for (const Entry* const entry : {row.match.base, row.match.old, row.match.latest}) {
+    if (entry == nullptr) {
+      continue;
+    }
+    const migration::Values& own = entry->kept->object->namesInPlace();
+    if (contains(names, entry->kept->object->oidInPlace()) ||
+        std::any_of(own.begin(), own.end(),
+                    [&](const std::string& name) { return contains(names, name); })) {
+      return true;
+    }
+  }
+  return false;
+}
+
+// A clause that differs only in what is ignored.
+bool isIgnored(const ClauseChange& change, const std::vector<std::string>& ignored) {
+  if (change.aspect == Aspect::kDesc) {
+    return contains(ignored, "desc");
+  }
+  const auto normal = [&](migration::Values values) {
+    if (contains(ignored, "case")) {
+      for (std::string& value : values) {
+        value = migration::folded(value);
+      }
+    }
+    if (contains(ignored, "order")) {
+      std::sort(values.begin(), values.end());
+    }
+    return values;
+  };
+  return (contains(ignored, "case") || contains(ignored, "order")) &&
+         normal(change.old) == normal(change.latest);
+}
+
+bool isShown(const Verdict& row, const DifferenceFilter& filter) {
+  const bool isSame =
+      row.outcome == migration::Outcome::kSame || row.outcome == migration::Outcome::kGone;
+  if (isSame && !filter.isWithSame) {
+    return false;
+  }
+  const bool isAllIgnored =
+      !filter.ignored.empty() && !row.clauses.empty() &&
+      std::all_of(row.clauses.begin(), row.clauses.end(),
+                  [&](const ClauseChange& change) { return isIgnored(change, filter.ignored); });
+  return !isAllIgnored && (filter.names.empty() || isNamed(row, filter.names)) &&
+         (filter.kinds.empty() || contains(filter.kinds, wordOf(row.kind()))) &&
+         (filter.changes.empty() || contains(filter.changes, wordOf(row.change))) &&
+         (filter.risks.empty() || contains(filter.risks, wordOf(row.risk)));
+}
+
+// ---- Text ----
+
+constexpr char kBold[] = "\033[1m";
+constexpr char kRed[] = "\033[31m";
+constexpr char kPlain[] = "\033[0m";
+
+class TextWriter {
+ public:
+  explicit TextWriter(const PlanStyle& style) : m_style(style) {}
+
+  void addDifference(const Verdict& row) {
+    const bool isUrgent = row.isUndecided();
+    m_text += coloured(isUrgent ? kRed : kBold, printable(describe(row))) + ": " +
+              nameOf(row.change) + (row.isRenamed ? ", renamed" : "") +
+              (row.isRenumbered ? ", renumbered" : "") + " -> " +
+              coloured(isUrgent ? kRed : kBold, std::string(wordOf(row.outcome)));
+    m_text +=
+        row.risk == migration::Risk::kNone ? "\n" : " [" + std::string(wordOf(row.risk)) + "]\n";
+    addLine("", printable(row.reason));
+    addPlaces(row);
+    for (const ClauseChange& change : row.clauses) {
+      addClause(change);
+    }
+    for (const std::string& note : row.notes) {
+      addLine("note", printable(note));
+    }
+    if (!row.decision.empty()) {
+      addLine("decided", printable(row.decision));
+    }
+  }
+
+  void addText(const std::string& text) { m_text += text; }
+  std::string coloured(const char* colour, const std::string& text) const {
+    return m_style.isColoured ? colour + text + kPlain : text;
+  }
+  std::string take() { return std::move(m_text); }
+
+ private:
+  void addLine(std::string label, const std::string& value) {
+    constexpr std::size_t kLabel = 10;
+    if (!label.empty() && !value.empty()) {
+      label.resize(std::max(label.size() + 1, kLabel), ' ');
+    }
+    m_text += "  " + label + value + "\n";
+  }
+
+  void addPlaces(const Verdict& row) {
+    std::string places;
+    const auto add = [&](const char* side, const Entry* entry) {
+      if (entry != nullptr) {
+        places.append(places.empty() ? "" : ", ")
+            .append(side)
+            .append(" ")
+            .append(placeOf(entry->file->name, entry->place().line));
+      }
+    };
+    add("BASE", row.match.base);
+    add("OLD", row.match.old);
+    add("NEW", row.match.latest);
+    addLine("", printable(places));
+  }
+
+  void addClause(const ClauseChange& change) {
+    addLine(std::string(nameOf(change.aspect)), "");
+    const auto add = [&](const char* side, const migration::Values& values) {
+      if (!values.empty()) {
+        addLine(std::string("  ") + side, wholePrintable(shownValue(change.aspect, values)));
+      }
+    };
+    add("base", change.base);
+    add("old", change.old);
+    add("new", change.latest);
+    if (change.isDecided) {
+      add("result", change.result);
+    } else {
+      addLine("  result", "undecided");
+    }
+  }
+
+  const PlanStyle& m_style;
+  std::string m_text;
+};
+
+// "3 added by site, 1 taken".
+template <typename Word>
+std::string countsOf(const ShownDifferences& shown, Word word) {
+  std::map<std::string, std::size_t> counts;
+  for (const Verdict* const row : shown) {
+    ++counts[std::string(word(*row))];
+  }
+  std::string text;
+  for (const auto& [name, count] : counts) {
+    text += "  " + std::to_string(count) + " " + name + "\n";
+  }
+  return text;
+}
+
+std::string lineOf(const migration::Failure& failure) {
+  const std::string rule = failure.rule.empty() ? "" : " [" + failure.rule + "]";
+  if (failure.line == 0) {
+    return errorLine(failure.file, failure.text + rule);
+  }
+  return errorLine(placeOf(failure.file, {failure.line, failure.column}), failure.text + rule);
+}
+
+}  // namespace
+
+ShownDifferences shownOf(const MigrationPlan& plan, const DifferenceFilter& filter) {
+  ShownDifferences shown;
+  for (const Verdict& row : plan.threeWay.differences) {
+    if (isShown(row, filter)) {
+      shown.push_back(&row);
+    }
+  }
+  return shown;
+}
+
+std::string renderDifferences(const MigrationPlan& plan, const ShownDifferences& shown,
+                              const PlanStyle& style) {
+  TextWriter writer(style);
+  if (!style.isSummaryOnly) {
+    for (const Verdict* const row : shown) {
+      writer.addDifference(*row);
+      writer.addText("\n");
+    }
+  }
+  writer.addText(counted(shown.size(), "difference") + " in " +
+                 counted(plan.threeWay.differences.size(), "definition") +
+                 (shown.empty() ? "\n" : ", by who changed them:\n"));
+  writer.addText(countsOf(shown, [](const Verdict& row) { return nameOf(row.change); }));
+  if (!shown.empty()) {
+    writer.addText("and by what comes of them:\n");
+    writer.addText(countsOf(shown, [](const Verdict& row) { return wordOf(row.outcome); }));
+  }
+  return writer.take();
+}
+
+std::string whyNotReady(const MigrationPlan& plan) {
+  std::string lines;
+  for (const migration::Failure& refusal : plan.refusals) {
+    lines += lineOf(refusal);
+  }
+  for (const Verdict& row : plan.threeWay.differences) {
+    if (row.isUndecided()) {
+      lines += errorLine("undecided: " + printable(describe(row)) + ": " + printable(row.reason));
+    }
+  }
+  return lines;
+}
+
+std::string renderReadiness(const MigrationPlan& plan, const PlanStyle& style) {
+  if (plan.isReady()) {
+    return "Ready: every definition is decided.\n";
+  }
+  const TextWriter writer(style);
+  return writer.coloured(kRed, "Not ready: " + counted(plan.undecidedCount, "definition") +
+                                   " undecided, " + counted(plan.refusals.size(), "other reason") +
+                                   ".") +
+         "\n";
+}

@@ -1,0 +1,172 @@
+#!/usr/bin/env bash
+# servers.sh objects: compiles what the servers consist of.
+# servers.sh CASE: links a server that has a trace facility, a clock and a symbol table of its own, with
+# the installed library, and compares all that it prints: the records, the time and the table are the
+# server's.
+
+set -euo pipefail
+here=$(cd "$(dirname "$0")" && pwd)
+. "$here/expect.sh"
+
+objects=$(dirname "$WORK")/server_objects
+lib=$(dirname "$(find "$PREFIX" -name libschema.a)")
+export PKG_CONFIG_PATH=$lib/pkgconfig LD_LIBRARY_PATH=$lib:$WORK
+read -ra flags <<<"$CONSUMER_FLAGS $("$PKG_CONFIG" --cflags libschema)"
+read -ra shared <<<"$("$PKG_CONFIG" --libs libschema)"
+schema=$lib/libschema.a
+platform=$lib/libschema-platform.a
+
+# compile OBJECT SOURCE [FLAG...]
+compile() {
+  "$CXX" "${flags[@]}" -fPIC "${@:3}" -c "$here/servers/$2.cpp" -o "$1.o"
+}
+
+compile_objects() {
+  compile main main
+  compile main_hidden main -fvisibility=hidden
+  compile main_setting main -DSETS_MASK=0x04001000
+  compile main_setting_no_pie main -DSETS_MASK=0x04001000 -fno-pic -fno-pie
+  compile main_loading main '-DPLUGIN="libplugin.so"'
+  compile migrate migrate
+  compile migrate_hidden migrate -fvisibility=hidden
+  compile facility facility
+  compile facility_hidden facility -fvisibility=hidden
+  compile facility_unset facility -DSERVER_MASK=0
+  compile symbols symbols
+  compile symbols_hidden symbols -fvisibility=hidden
+}
+
+# link WHAT...: the program `server`.
+link() {
+  (cd "$objects" && "$CXX" "${flags[@]}" "$@" -L"$WORK" -o "$WORK/server")
+}
+
+# library NAME WHAT...: lib<NAME>.so; archive NAME WHAT...: lib<NAME>.a.
+library() {
+  (cd "$objects" && "$CXX" "${flags[@]}" -shared "${@:2}" -L"$WORK" -o "$WORK/lib$1.so")
+}
+archive() {
+  (cd "$objects" && ar rc "$WORK/lib$1.a" "${@:2}")
+}
+
+build() {
+  case $1 in
+    # All in the program.
+    program) link main.o migrate.o facility.o symbols.o "${shared[@]}" ;;
+    program_hidden)
+      link main_hidden.o migrate_hidden.o facility_hidden.o symbols_hidden.o "${shared[@]}"
+      ;;
+    program_before_static) link main.o migrate.o facility.o symbols.o "$schema" "$platform" ;;
+    program_behind_static) link main.o migrate.o "$schema" "$platform" facility.o symbols.o ;;
+
+    # In a shared library.
+    library_before)
+      library server facility.o symbols.o
+      link main.o migrate.o -lserver "${shared[@]}"
+      ;;
+    library_behind)
+      library server facility.o symbols.o
+      link main.o migrate.o "${shared[@]}" -lserver
+      ;;
+    library_behind_hidden)
+      library server facility_hidden.o symbols.o
+      link main_hidden.o migrate_hidden.o "${shared[@]}" -lserver
+      ;;
+    library_behind_setting)
+      library server facility_unset.o symbols.o
+      link main_setting.o migrate.o "${shared[@]}" -lserver
+      ;;
+    library_behind_setting_no_pie)
+      library server facility_unset.o symbols.o
+      link -no-pie main_setting_no_pie.o migrate.o "${shared[@]}" -lserver
+      ;;
+    library_before_static)
+      library server facility.o symbols.o
+      link main.o migrate.o -lserver "$schema" "$platform"
+      ;;
+    library_behind_static)
+      library server facility.o symbols.o
+      link main.o migrate.o "$schema" -lserver
+      ;;
+
+    # In an archive.
+    archive_behind)
+      archive server facility.o symbols.o
+      link main.o migrate.o "${shared[@]}" -lserver
+      ;;
+    archive_behind_static)
+      archive server facility.o symbols.o
+      link main.o migrate.o "$schema" -lserver "$platform"
+      ;;
+
+    # libschema is loaded by a plug-in.
+    plugin)
+      library plugin migrate.o facility.o symbols.o "${shared[@]}"
+      link main_loading.o
+      ;;
+    plugin_of_program)
+      library plugin migrate.o "${shared[@]}"
+      link -rdynamic main_loading.o facility.o symbols.o
+      ;;
+    plugin_of_program_static)
+      library plugin migrate.o "$schema" "$platform"
+      link -rdynamic main_loading.o facility.o symbols.o
+      ;;
+    plugin_of_library)
+      library server facility.o symbols.o
+      library plugin migrate.o "${shared[@]}"
+      link main_loading.o -Wl,--no-as-needed -lserver
+      ;;
+    plugin_with_library)
+      library server facility.o symbols.o
+      library plugin migrate.o "${shared[@]}" -lserver
+      link main_loading.o
+      ;;
+    *) expect "case" "one of those above" "$1" ;;
+  esac
+}
+
+printed="server table: cn 3, \$ 4, size 2, calls 11
+server entry 53051000 level 3200000
+server debug level 3400000 c8010000: SchemaLe
+server debug level 3400000 c8010000: SchemaLe
+server debug level 3400000 c8010000: SchemaLe
+server debug 53051000 level 3400000 c8010000: readFile: Parsing file: V3.user.at in directory: . 
+server debug level 3400000 c8010000: ~SchemaL
+server debug level 3400000 c8010000: lexan: l
+server debug 53051000 level 3400000 c8010000: readFile: Successfully parsed the file, V3.user.at.
+server exit 53051000 kind 33 bit 4096 code 0
+server table: cn 3, \$ 4, size 2, calls 15
+read 0, written 0
+# File generated by 6.1 migration server clock 1
+attributetypes=( 1.1.2 NAME ( 'sn'  )  DESC 'family name' USAGE userApplications  )
+server table: cn 3, \$ 4, size 2, calls 15"
+
+# check PROGRAM: runs it. Where the two symbol tables meet it can loop.
+check() {
+  local status=0 actual
+  rm -rf out V3.user.at
+  mkdir out
+  actual=$(timeout 60 "$1" 2>&1) || status=$?
+  expect "what $1 prints" "0 $printed" "$status $actual"
+}
+
+rm -rf "$WORK"
+mkdir -p "$WORK"
+cd "$WORK"
+case $1 in
+  objects) compile_objects ;;
+  find_package)
+    "$CMAKE" -S "$here/servers" -B build -DCMAKE_PREFIX_PATH="$PREFIX" -DCMAKE_CXX_COMPILER="$CXX" \
+      -DCMAKE_CXX_FLAGS="$CONSUMER_FLAGS"
+    "$CMAKE" --build build
+    for order in before behind; do
+      check "build/${order}_schema"
+      check "build/${order}_schema_static"
+    done
+    ;;
+  *)
+    build "$1"
+    check ./server
+    ;;
+esac

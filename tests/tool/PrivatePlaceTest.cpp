@@ -1,0 +1,156 @@
+// Where private copies lie.
+
+#include "PrivatePlace.h"
+
+#include <gtest/gtest.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <ctime>
+#include <filesystem>
+#include <fstream>
+
+#include "DiagnosticPlace.h"
+#include "Files.h"
+#include "Machine.h"
+#include "Messages.h"
+#include "SmallFileSystem.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr char kNoOpenFiles[] = "/nonexistent";
+
+// In a user namespace that has no root, whatever is root's seems to be somebody else's.
+#define SKIP_UNLESS_ROOT_IS_KNOWN()        \
+  if (!isBeyondOthers(folder.file("one"))) \
+  GTEST_SKIP() << "here the folder of the test belongs neither to root nor to the user"
+
+class PrivatePlaceIn : public testing::Test {
+ protected:
+  PrivatePlaceIn() {
+    for (const char* const name : {"one", "two"}) {
+      fs::create_directory(folder.file(name));
+    }
+  }
+
+  // The candidate that is taken, as "one" or "two", or what is told when none is.
+  std::string taken(const PrivatePlaceOptions& options) {
+    try {
+      const PrivatePlace place(options, &removals, &warnings);
+      std::ofstream(place.pathOf("file")) << "text";
+      const fs::path path = place.own().directory().path();
+      EXPECT_EQ("text", support::readWholeFile((path / "file").string()));
+      struct stat status {};
+      EXPECT_EQ(0, ::stat(path.c_str(), &status));
+      EXPECT_EQ(0700U, status.st_mode & 0777U);
+      return path.parent_path().filename().string();
+    } catch (const Failure& failure) {
+      EXPECT_EQ(kNotWritten, failure.exitCode());
+      return failure.what();
+    }
+  }
+
+  std::vector<std::string> both() const { return {folder.file("one"), folder.file("two")}; }
+
+  void setMode(const char* name, mode_t mode) const {
+    ASSERT_EQ(0, ::chmod(folder.file(name).c_str(), mode));
+  }
+
+  support::TemporaryDirectory folder;
+  Removals removals;
+  std::string warnings;
+};
+
+TEST_F(PrivatePlaceIn, FirstThatCanBeHad) {
+  EXPECT_EQ("one", taken({both()}));
+  EXPECT_EQ("two", taken({{folder.file("missing"), folder.file("two")}}));
+  folder.write("file", "");
+  EXPECT_EQ("two", taken({{folder.file("file"), folder.file("two")}}));
+  EXPECT_EQ(
+      "schema-migrate: error: no place can be had for the private copies of the files that are read and written; " +
+          folder.file("file") + ": Not a directory; " + folder.file("missing") +
+          ": No such file or directory; name one in TMPDIR\n",
+      taken({{folder.file("file"), folder.file("missing")}}));
+  EXPECT_TRUE(fs::is_empty(folder.file("one")));
+  EXPECT_TRUE(fs::is_empty(folder.file("two")));
+  EXPECT_EQ("", warnings);
+}
+
+// Where a path to the directory itself is to be had, nobody can lead it to something else.
+TEST_F(PrivatePlaceIn, DirectoryOfOthersWhenItIsReachedByItself) {
+  if (::access("/proc/self/fd", X_OK) != 0) {
+    GTEST_SKIP() << "/proc is not mounted";
+  }
+  setMode("one", 0777);
+  const PrivatePlace place({both()}, &removals, &warnings);
+  fs::rename(folder.file("one"), folder.file("moved"));
+  fs::create_directory(folder.file("one"));
+  const OwnDirectory& directory = place.own();
+  std::ofstream(place.pathOf("file")) << "text";
+  EXPECT_TRUE(fs::exists(folder.file("moved/" + directory.name() + "/file")));
+}
+
+TEST_F(PrivatePlaceIn, NoDirectoryOfOthersOtherwise) {
+  SKIP_UNLESS_ROOT_IS_KNOWN();
+  EXPECT_EQ("one", taken({both(), 0, kNoOpenFiles}));
+  for (const mode_t mode : {0777U, 0770U, 0702U}) {
+    setMode("one", mode);
+    EXPECT_EQ("two", taken({both(), 0, kNoOpenFiles}));
+  }
+  setMode("one", 01777);
+  EXPECT_EQ("one", taken({both(), 0, kNoOpenFiles}));
+  setMode("one", 0777);
+  EXPECT_EQ(
+      "schema-migrate: error: no place can be had for the private copies of the files that are read and written; " +
+          folder.file("one") +
+          ": other users can rename what is in it, or above it; name one in TMPDIR\n",
+      taken({{folder.file("one")}, 0, kNoOpenFiles}));
+  // Nor one below it.
+  fs::create_directory(folder.file("one/below"));
+  EXPECT_EQ("two", taken({{folder.file("one/below"), folder.file("two")}, 0, kNoOpenFiles}));
+  EXPECT_TRUE(fs::is_empty(folder.file("one/below")));
+}
+
+TEST_F(PrivatePlaceIn, NoDirectoryOfAnotherUserOtherwise) {
+  SKIP_UNLESS_ROOT_IS_KNOWN();
+  SKIP_UNLESS_MACHINE_CAN(kGiveFilesAway);
+  support::giveToAnotherUser(folder.file("one").c_str());
+  setMode("one", 0755);
+  EXPECT_EQ("two", taken({both(), 0, kNoOpenFiles}));
+}
+
+// Rather one with room enough than the first; rather the first than none.
+TEST_F(PrivatePlaceIn, FirstWithRoom) {
+  SKIP_UNLESS_MACHINE_CAN(kMountFileSystems);
+  const support::SmallFileSystem small(folder.file("one"), "mode=700,size=64k");
+  EXPECT_EQ("one", taken({both(), 60000}));
+  EXPECT_EQ("two", taken({both(), 70000}));
+  EXPECT_EQ("one", taken({{folder.file("one")}, 70000}));
+  EXPECT_EQ("one", taken({both(), std::uint64_t{1} << 62}));
+}
+
+// What a killed run left is named, unless that run may be under way.
+TEST_F(PrivatePlaceIn, LeftoversAreNamed) {
+  const std::string left = folder.file("one/schema-migrate-abcdef");
+  fs::create_directory(left);
+  EXPECT_EQ("one", taken({both()}));
+  EXPECT_EQ("", warnings);
+  const timespec times[2] = {{std::time(nullptr) - 100, 0}, {std::time(nullptr) - 100, 0}};
+  ASSERT_EQ(0, ::utimensat(AT_FDCWD, left.c_str(), times, 0));
+  const int lock = ::open(left.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+  ASSERT_EQ(0, ::flock(lock, LOCK_EX | LOCK_NB));
+  EXPECT_EQ("one", taken({both()}));
+  EXPECT_EQ("", warnings);
+  ::close(lock);
+  EXPECT_EQ("one", taken({both()}));
+  EXPECT_EQ(
+      left +
+          ": warning: private copies left behind by a run that was killed; they are not used, and can be removed\n",
+      warnings);
+  EXPECT_TRUE(fs::exists(left));
+}
+
+}  // namespace
