@@ -255,6 +255,53 @@ TEST_F(Planned, WhatTheResultWouldBreakIsRefused) {
   EXPECT_NE(result.err.find("(new in this result)"), std::string::npos) << result.err;
 }
 
+TEST_F(Planned, JsonHasWhatADefinitionSaysBesideItsDifferences) {
+  const ToolResult result = run("diff", {"a", "--base", "@/base", "--format", "json"});
+  EXPECT_NE(result.out.find("\"otherClauses\": [\n"
+                            "        {\n"
+                            "          \"clause\": \"OID\",\n"
+                            "          \"value\": \"1.1\"\n"
+                            "        },\n"
+                            "        {\n"
+                            "          \"clause\": \"NAME\",\n"
+                            "          \"value\": \"'a'\"\n"
+                            "        },\n"
+                            "        {\n"
+                            "          \"clause\": \"DESC\",\n"
+                            "          \"value\": \"'d'\"\n"
+                            "        },\n"
+                            "        {\n"
+                            "          \"clause\": \"USAGE\",\n"
+                            "          \"value\": \"userApplications\"\n"
+                            "        }\n"
+                            "      ]"),
+            std::string::npos)
+      << result.out;
+}
+
+TEST_F(Planned, JsonHasTheSuperiorsAroundWhatChanges) {
+  // guard is asked for; its superior c is there, too, and e, which has nothing to do with it, not.
+  const ToolResult result = run("diff", {"guard", "--base", "@/base", "--format", "json"});
+  EXPECT_NE(result.out.find("\"superiors\": [\n"
+                            "    {\n"
+                            "      \"kind\": \"object-class\",\n"
+                            "      \"oid\": \"2.1\",\n"
+                            "      \"name\": \"c\",\n"
+                            "      \"superiors\": []\n"
+                            "    },\n"
+                            "    {\n"
+                            "      \"kind\": \"object-class\",\n"
+                            "      \"oid\": \"9.2\",\n"
+                            "      \"name\": \"guard\",\n"
+                            "      \"superiors\": [\n"
+                            "        \"c\"\n"
+                            "      ]\n"
+                            "    }\n"
+                            "  ]"),
+            std::string::npos)
+      << result.out;
+}
+
 TEST_F(Planned, JsonFollowsItsSchema) {
   if (std::system("python3 -c 'import jsonschema' 2>/dev/null") != 0) {
     GTEST_SKIP() << "needs python3-jsonschema";

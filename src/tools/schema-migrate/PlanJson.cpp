@@ -2,10 +2,12 @@
 
 #include <libschema-migration/Content.h>
 
+#include <algorithm>
 #include <map>
 
 #include "Json.h"
 #include "PlanReport.h"
+#include "PlanSuperiors.h"
 
 namespace {
 
@@ -39,6 +41,23 @@ Json clauseOf(const ClauseChange& change) {
           {"result", change.isDecided ? valueOf(change.aspect, change.result) : Json(nullptr)},
           {"decided", change.isDecided},
           {"risk", wordOf(change.risk)}};
+}
+
+// What it says beside the clauses that differ, so that a reader has the whole of it.
+Json otherClausesOf(const Verdict& row) {
+  const Entry& entry = row.match.latest != nullptr ? *row.match.latest : row.entry();
+  const migration::Content content = contentOf(*entry.kept);
+  Json clauses = Json::array();
+  for (const migration::Aspect aspect : migration::aspectsOf(row.kind())) {
+    const bool isTold =
+        std::any_of(row.clauses.begin(), row.clauses.end(),
+                    [&](const ClauseChange& change) { return change.aspect == aspect; });
+    if (!isTold && !shownValue(aspect, content[aspect]).empty()) {
+      clauses.push_back(
+          {{"clause", nameOf(aspect)}, {"value", shownValue(aspect, content[aspect])}});
+    }
+  }
+  return clauses;
 }
 
 std::string nameOfDefinition(const Verdict& row, const std::vector<Verdict>& rows) {
@@ -79,11 +98,23 @@ Json definitionOf(const MigrationPlan& plan, const Verdict& row) {
           {"fingerprint", fingerprintOf(row)},
           {"text", row.isCarried() ? Json(migration::textOf(*row.result)) : Json(nullptr)},
           {"clauses", clauses},
+          {"otherClauses", otherClausesOf(row)},
           {"places",
            {{"base", placeOf(row.match.base)},
             {"old", placeOf(row.match.old)},
             {"new", placeOf(row.match.latest)},
             {"result", placeOf(inResult(plan, row))}}}};
+}
+
+Json superiorsOf(const MigrationPlan& plan, const ShownDifferences& shown) {
+  Json array = Json::array();
+  for (const SuperiorNode& node : superiorsAround(plan, shown)) {
+    array.push_back({{"kind", wordOf(node.row->kind())},
+                     {"oid", node.row->entry().kept->object->oidInPlace()},
+                     {"name", nameOfDefinition(*node.row, plan.threeWay.differences)},
+                     {"superiors", *node.superiors}});
+  }
+  return array;
 }
 
 Json findingsOf(const migration::Findings& findings) {
@@ -139,6 +170,7 @@ std::string renderPlanJson(const MigrationPlan& plan, const ShownDifferences& sh
                  {"ready", plan.isReady()},
                  {"inputs", inputs},
                  {"definitions", definitions},
+                 {"superiors", superiorsOf(plan, shown)},
                  {"findings", findingsOf(plan.ofInputs)},
                  {"newInResult", findingsOf(plan.newInResult)},
                  {"refusals", failuresOf(plan.refusals)},
