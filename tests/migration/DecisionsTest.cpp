@@ -430,6 +430,24 @@ TEST(Decisions, WhatSharesOnlyTheNameIsRenamedBesideNews) {
       "vendor extension 9.1 -> added by d.toml:1 ( 9.1 DBNAME ( 'b' ) ACCESS-CLASS normal )\n");
 }
 
+TEST(Decisions, TheFingerprintOfWhatIsRenamedBesideNewsIsThatOfBoth) {
+  const Inputs renumbered = {"", kTaken.old,
+                             at("1.5 NAME 'badge' USAGE u") + at("1.6 NAME 'y' USAGE u")};
+  const Installation old = installationOf("OLD", renumbered.old);
+  const Installation latest = installationOf("NEW", renumbered.latest);
+  ThreeWayRequest request;
+  request.old = &old;
+  request.latest = &latest;
+  const ThreeWay plain = compareThreeWay(request);
+  const std::string fingerprint = fingerprintOf(plain.differences.front());
+  ASSERT_EQ(describe(plain.differences.front()), "attribute type badge (9.1)");
+  const std::string outcome =
+      decided(renumbered, about("attribute-type", "badge",
+                                "rename = 'siteBadge'\nfingerprint = '" + fingerprint + "'"));
+  EXPECT_EQ(outcome, decided(renumbered, about("attribute-type", "badge", "rename = 'siteBadge'")));
+  EXPECT_EQ(outcome.find("d.toml:1: "), std::string::npos) << outcome;
+}
+
 TEST(Decisions, OneDecisionCoversAnAttributeTypeAndItsExtension) {
   const Inputs removed = {at("1.1 NAME 'a' USAGE u") + orv("1.1 DBNAME ( 'a' )"),
                           at("1.1 NAME 'a' USAGE v") + orv("1.1 DBNAME ( 'a' )"), ""};

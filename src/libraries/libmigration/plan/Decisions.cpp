@@ -88,7 +88,7 @@ std::size_t split(std::size_t row, std::vector<Verdict>* rows) {
   for (std::size_t extension = 0; extension < own; ++extension) {
     const MatchRow& match = (*rows)[extension].match;
     if (match.kind == Kind::kVendorExtension && match.attribute == row && match.old != nullptr) {
-      const std::size_t ofMine = split(extension, rows);
+      const std::size_t ofMine = match.latest == nullptr ? extension : split(extension, rows);
       (*rows)[ofMine].match.attribute = own;
       break;
     }
@@ -374,7 +374,8 @@ class Carrying {
 };
 
 // What the result would have twice because of a decision; empty when all is well.
-std::string clashOf(const ResultIndex& index, const Verdict& row) {
+// `self` is the row as the index has it.
+std::string clashOf(const ResultIndex& index, const Verdict& row, const Verdict* self) {
   const auto told = [](const std::string& what, const Verdict& holder) {
     return "its " + what + " would also be that of " + describe(holder);
   };
@@ -383,17 +384,17 @@ std::string clashOf(const ResultIndex& index, const Verdict& row) {
   }
   if (row.kind() == Kind::kVendorExtension) {
     for (const std::string& name : dbNamesInResult(row)) {
-      if (const Verdict* const holder = index.byDbName(name, &row)) {
+      if (const Verdict* const holder = index.byDbName(name, self)) {
         return told("DBNAME '" + name + "'", *holder);
       }
     }
     return "";
   }
-  if (const Verdict* const holder = index.byOid(row.result->oid(), &row)) {
+  if (const Verdict* const holder = index.byOid(row.result->oid(), self)) {
     return told("OID " + row.result->oid(), *holder);
   }
   for (const std::string& name : row.result->names()) {
-    if (const Verdict* const holder = index.byName(row.kind(), name, &row)) {
+    if (const Verdict* const holder = index.byName(row.kind(), name, self)) {
       return told("name '" + name + "'", *holder);
     }
   }
@@ -428,7 +429,8 @@ class Applying {
     for (const Decision& decision : m_decisions) {
       const std::optional<std::size_t> row = m_index.find(decision);
       if (row && isToBeSplit(decision, m_rows[*row])) {
-        split(*row, &m_rows);
+        const std::string fingerprint = fingerprintOf(m_rows[*row]);
+        m_fingerprints[split(*row, &m_rows)] = fingerprint;
         isSplit = true;
       }
     }
@@ -441,6 +443,12 @@ class Applying {
     m_failures.push_back({decision.file, decision.line, 1, "", text});
   }
 
+  // What is split was one difference when the decision about it was made.
+  std::string currentFingerprint(std::size_t row) const {
+    const auto whole = m_fingerprints.find(row);
+    return whole == m_fingerprints.end() ? fingerprintOf(m_rows[row]) : whole->second;
+  }
+
   void carryOut(const Decision& decision, std::size_t row) {
     const auto [made, isNew] = m_made.emplace(row, &decision);
     const std::string who = "the decision about " + describe(m_rows[row]);
@@ -451,7 +459,7 @@ class Applying {
       }
       return;
     }
-    if (!decision.fingerprint.empty() && decision.fingerprint != fingerprintOf(m_rows[row])) {
+    if (!decision.fingerprint.empty() && decision.fingerprint != currentFingerprint(row)) {
       fail(decision, who +
                          " is stale: the definition has changed since it was made; look at it "
                          "again, and make it anew");
@@ -467,7 +475,7 @@ class Applying {
   void checkResult() {
     const ResultIndex index(m_rows, ResultIndex::Of::kAll);
     for (const auto& [row, decision] : m_made) {
-      const std::string clash = clashOf(index, m_rows[row]);
+      const std::string clash = clashOf(index, m_rows[row], &m_rows[row]);
       if (!clash.empty() && !m_rows[row].decision.empty()) {
         fail(*decision, "the decision about " + describe(m_rows[row]) + " cannot be carried out: " +
                             clash + "; rename or renumber it, or take NEW's");
@@ -501,6 +509,7 @@ class Applying {
   RowIndex m_index;
   Failures& m_failures;
   std::map<std::size_t, const Decision*> m_made;
+  std::map<std::size_t, std::string> m_fingerprints;  // of what was split
 };
 
 }  // namespace
@@ -513,6 +522,13 @@ std::string fingerprintOf(const Verdict& difference) {
     text += '\n';
   }
   return "sha256:" + sha256Of(text);
+}
+
+std::string tryDecision(const Decision& decision, const ResultIndex& result,
+                        const Verdict& difference, Verdict* after) {
+  *after = difference;
+  const std::string problem = Carrying(decision, after).run();
+  return problem.empty() ? clashOf(result, *after, &difference) : problem;
 }
 
 void applyDecisions(const std::vector<Decision>& decisions, bool allowUnused,

@@ -8,6 +8,7 @@
 #include <cstdint>
 #include <map>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "Finding.h"
@@ -19,6 +20,9 @@ namespace migration {
 // Whose definition, or whose clause. Of a clause kUnion is NEW's members and then OLD's further
 // ones.
 enum class Take : std::uint8_t { kNothing, kOld, kNew, kBase, kMerged, kDrop, kUnion };
+
+// "old", "new", "base", "merged", "drop", "union"; empty for kNothing.
+std::string_view wordOf(Take take);
 
 struct Decision {
   std::string file;
@@ -50,6 +54,13 @@ std::string fingerprintOf(const Verdict& difference);
 // nothing.
 void applyDecisions(const std::vector<Decision>& decisions, bool allowUnused,
                     std::vector<Verdict>* differences, Failures* failures);
+
+class ResultIndex;
+// What one decision would come to: *after is the difference with it carried out. Returns what is
+// wrong, or "". `result` has everything that the result has so far, and the difference is one of
+// its.
+std::string tryDecision(const Decision& decision, const ResultIndex& result,
+                        const Verdict& difference, Verdict* after);
 
 }  // namespace migration
 

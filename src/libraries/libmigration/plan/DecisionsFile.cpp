@@ -17,10 +17,11 @@ namespace migration {
 
 namespace {
 
+constexpr std::pair<std::string_view, Take> kWords[] = {
+    {"old", Take::kOld},       {"new", Take::kNew},   {"base", Take::kBase},
+    {"merged", Take::kMerged}, {"drop", Take::kDrop}, {"union", Take::kUnion}};
+
 std::optional<Take> takeOf(std::string_view word) {
-  constexpr std::pair<std::string_view, Take> kWords[] = {
-      {"old", Take::kOld},       {"new", Take::kNew},   {"base", Take::kBase},
-      {"merged", Take::kMerged}, {"drop", Take::kDrop}, {"union", Take::kUnion}};
   for (const auto& [text, take] : kWords) {
     if (text == word) {
       return take;
@@ -186,6 +187,15 @@ class EntryReader {
 };
 
 }  // namespace
+
+std::string_view wordOf(Take take) {
+  for (const auto& [text, word] : kWords) {
+    if (word == take) {
+      return text;
+    }
+  }
+  return "";
+}
 
 void readDecisions(const Source& source, std::vector<Decision>* decisions, Failures* failures) {
   const toml::parse_result parsed = toml::parse(source.bytes(), source.path());

@@ -16,6 +16,53 @@ namespace migration {
 
 namespace {
 
+Findings checked(const Installation& installation) {
+  CheckRequest request;
+  request.installation = &installation;
+  return check(request);
+}
+
+std::string keyOf(const Finding& finding) { return finding.rule + finding.definition; }
+
+// A reference that dangles, a name that is another one's now, two definitions with one name: what
+// only warns about a habit of writing breaks nothing.
+bool isBroken(const Finding& finding) {
+  const bool isHarmless = finding.rule == "R405" || finding.rule == "T305" ||
+                          finding.rule == "T306" || finding.rule == "T307";
+  const char family = finding.rule.front();
+  return finding.severity == Severity::kError ||
+         ((family == 'T' || family == 'R' || family == 'V') && !isHarmless);
+}
+
+void checkResult(MigrationPlan* plan) {
+  plan->resultTexts = inNewsLayout(plan->request, plan->threeWay);
+  plan->result =
+      Installation::fromTexts("result", plan->resultTexts, plan->limits, &plan->refusals);
+  std::map<std::string, std::size_t> seen;
+  for (Finding& finding : checked(*plan->result)) {
+    const std::string key = keyOf(finding);
+    const auto known = plan->knownFindings.find(key);
+    const bool isKnown = ++seen[key] <= (known == plan->knownFindings.end() ? 0 : known->second);
+    if (isKnown || !isBroken(finding)) {
+      continue;
+    }
+    finding.severity = Severity::kError;
+    plan->refusals.push_back({finding.file, finding.line, finding.column, finding.rule,
+                              finding.text + " (new in this result)"});
+    plan->newInResult.push_back(std::move(finding));
+  }
+}
+
+// What follows from the comparison.
+void draw(MigrationPlan* plan) {
+  const ThreeWay& threeWay = plan->threeWay;
+  plan->refusals.insert(plan->refusals.end(), threeWay.failures.begin(), threeWay.failures.end());
+  plan->undecidedCount = static_cast<std::size_t>(
+      std::count_if(threeWay.differences.begin(), threeWay.differences.end(),
+                    [](const Verdict& row) { return row.isUndecided(); }));
+  checkResult(plan);
+}
+
 class PlanMaker {
  public:
   explicit PlanMaker(const PlanRequest& request)
@@ -27,25 +74,34 @@ class PlanMaker {
       return std::move(m_plan);
     }
     checkInputs();
+    tell("comparing");
     m_plan->threeWay = compareThreeWay(m_plan->request);
-    takeDecisionFailures();
     doubtBase();
-    m_plan->undecidedCount = static_cast<std::size_t>(
-        std::count_if(m_plan->threeWay.differences.begin(), m_plan->threeWay.differences.end(),
-                      [](const Verdict& row) { return row.isUndecided(); }));
-    checkResult();
+    m_plan->inputRefusalCount = m_plan->refusals.size();
+    tell("checking the result");
+    draw(m_plan.get());
     return std::move(m_plan);
   }
 
  private:
+  void tell(const char* step) const {
+    if (m_request.onStep) {
+      m_request.onStep(step);
+    }
+  }
+
   // ---- Inputs ----
 
   void readInputs() {
+    m_plan->limits = m_request.limits;
     if (!m_request.base.empty()) {
+      tell("reading BASE");
       m_plan->base = readInstallation("base", m_request.base);
       m_plan->request.base = &*m_plan->base;
     }
+    tell("reading OLD");
     m_plan->old = readInstallation("old", m_request.old);
+    tell("reading NEW");
     m_plan->latest = readInstallation("new", m_request.latest);
     m_plan->request.old = &*m_plan->old;
     m_plan->request.latest = &*m_plan->latest;
@@ -112,22 +168,19 @@ class PlanMaker {
 
   // ---- Findings ----
 
-  Findings checked(const Installation& installation) const {
-    CheckRequest request;
-    request.installation = &installation;
-    return check(request);
-  }
-
   void checkInputs() {
     if (m_plan->base) {
+      tell("checking BASE");
       add(checked(*m_plan->base));
     }
+    tell("checking OLD");
     CheckRequest request;
     request.installation = &*m_plan->old;
     request.against = &*m_plan->latest;
     request.excludeLists = m_excludeLists;
     request.withdrawList = m_withdrawList;
     countAndAdd(check(request));
+    tell("checking NEW");
     countAndAdd(checked(*m_plan->latest));
   }
 
@@ -145,13 +198,11 @@ class PlanMaker {
       ++counts[keyOf(finding)];
     }
     for (const auto& [key, count] : counts) {
-      std::size_t& known = m_known[key];
+      std::size_t& known = m_plan->knownFindings[key];
       known = std::max(known, count);
     }
     add(std::move(findings));
   }
-
-  static std::string keyOf(const Finding& finding) { return finding.rule + finding.definition; }
 
   // What the library's reading loses must not get lost unseen.
   void refuseLoss(const Finding& finding) {
@@ -162,38 +213,7 @@ class PlanMaker {
     }
   }
 
-  // A reference that dangles, a name that is another one's now, two definitions with one name: what
-  // only warns about a habit of writing breaks nothing.
-  static bool isBroken(const Finding& finding) {
-    const bool isHarmless = finding.rule == "R405" || finding.rule == "T305" ||
-                            finding.rule == "T306" || finding.rule == "T307";
-    const char family = finding.rule.front();
-    return finding.severity == Severity::kError ||
-           ((family == 'T' || family == 'R' || family == 'V') && !isHarmless);
-  }
-
-  void checkResult() {
-    m_plan->resultTexts = inNewsLayout(m_plan->request, m_plan->threeWay);
-    m_plan->result =
-        Installation::fromTexts("result", m_plan->resultTexts, m_request.limits, &m_plan->refusals);
-    std::map<std::string, std::size_t> seen;
-    for (Finding& finding : checked(*m_plan->result)) {
-      if (++seen[keyOf(finding)] <= m_known[keyOf(finding)] || !isBroken(finding)) {
-        continue;
-      }
-      finding.severity = Severity::kError;
-      m_plan->refusals.push_back({finding.file, finding.line, finding.column, finding.rule,
-                                  finding.text + " (new in this result)"});
-      m_plan->newInResult.push_back(std::move(finding));
-    }
-  }
-
   // ---- The comparison ----
-
-  void takeDecisionFailures() {
-    Failures& failures = m_plan->threeWay.failures;
-    m_plan->refusals.insert(m_plan->refusals.end(), failures.begin(), failures.end());
-  }
 
   void doubtBase() {
     const std::string& equal = m_plan->threeWay.suspiciousBase;
@@ -214,13 +234,20 @@ class PlanMaker {
   std::unique_ptr<MigrationPlan> m_plan;
   std::vector<const Source*> m_excludeLists;
   const Source* m_withdrawList = nullptr;
-  std::map<std::string, std::size_t> m_known;
 };
 
 }  // namespace
 
 std::unique_ptr<MigrationPlan> makePlan(const PlanRequest& request) {
   return PlanMaker(request).make();
+}
+
+void decideAnew(std::vector<Decision> decisions, MigrationPlan* plan) {
+  plan->request.decisions = std::move(decisions);
+  plan->refusals.resize(plan->inputRefusalCount);
+  plan->newInResult.clear();
+  plan->threeWay = compareThreeWay(plan->request);
+  draw(plan);
 }
 
 }  // namespace migration

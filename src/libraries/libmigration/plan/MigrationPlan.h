@@ -7,6 +7,8 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <functional>
+#include <map>
 #include <memory>
 #include <optional>
 #include <string>
@@ -29,6 +31,8 @@ struct PlanRequest {
   bool allowUnused = false;  // decisions that match nothing
   bool acceptBase = false;   // a BASE that equals OLD, or NEW
   ReadLimits limits;
+  // Called with what is done next, as in "reading OLD": a plan of many definitions takes its time.
+  std::function<void(const char* step)> onStep;
 };
 
 // A file that the plan was made from.
@@ -61,6 +65,12 @@ struct MigrationPlan {
   std::optional<Installation> old;
   std::optional<Installation> latest;
   std::vector<std::unique_ptr<Source>> lists;
+  ReadLimits limits;
+
+  // How often OLD or NEW has what the rules find, by rule and definition; the result may, too.
+  std::map<std::string, std::size_t> knownFindings;
+  // The first of the refusals are there whatever is decided.
+  std::size_t inputRefusalCount = 0;
 
   // The result in NEW's layout, as it stands with what is undecided left at NEW's.
   std::vector<NamedText> resultTexts;
@@ -69,6 +79,10 @@ struct MigrationPlan {
 
 // Works the plan out. Nothing is written.
 std::unique_ptr<MigrationPlan> makePlan(const PlanRequest& request);
+
+// Works out anew what follows from decisions, with these in the place of the plan's. Nothing is
+// read again. What referred to the plan's differences no longer does.
+void decideAnew(std::vector<Decision> decisions, MigrationPlan* plan);
 
 }  // namespace migration
 
