@@ -69,6 +69,7 @@ class PlanMaker {
       : m_request(request), m_plan(std::make_unique<MigrationPlan>()) {}
 
   std::unique_ptr<MigrationPlan> make() {
+    m_plan->asked = m_request;
     readInputs();
     if (!m_plan->failures.empty()) {
       return std::move(m_plan);

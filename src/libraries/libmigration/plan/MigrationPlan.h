@@ -43,6 +43,7 @@ struct PlanInput {
 };
 
 struct MigrationPlan {
+  PlanRequest asked;
   std::vector<PlanInput> inputs;
   ThreeWay threeWay;
 

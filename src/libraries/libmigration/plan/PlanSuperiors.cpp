@@ -5,24 +5,21 @@
 #include <unordered_map>
 #include <unordered_set>
 
-namespace {
+namespace migration {
 
-using migration::Entry;
-using migration::Kind;
-using migration::Values;
-using migration::Verdict;
+namespace {
 
 const Entry& latestOf(const Verdict& row) {
   return row.match.latest != nullptr ? *row.match.latest : row.entry();
 }
 
 const Values& superiorsOf(const Verdict& row) {
-  return row.isCarried() ? (*row.result)[migration::Aspect::kSup]
+  return row.isCarried() ? (*row.result)[Aspect::kSup]
                          : latestOf(row).kept->object->superiorsInPlace();
 }
 
 bool isSameEverywhere(const Verdict& row) {
-  return row.outcome == migration::Outcome::kSame || row.outcome == migration::Outcome::kGone;
+  return row.outcome == Outcome::kSame || row.outcome == Outcome::kGone;
 }
 
 // Definitions by what SUP may call them, and what is chosen among them.
@@ -36,7 +33,7 @@ class Around {
     }
   }
 
-  void choose(const ShownDifferences& shown) {
+  void choose(const std::vector<const Verdict*>& shown) {
     std::unordered_set<const Verdict*> changed;
     for (const Verdict* const row : shown) {
       if (hasSuperiors(*row) && !isSameEverywhere(*row)) {
@@ -75,9 +72,7 @@ class Around {
 
   void enter(const Verdict& row) {
     Names& names = m_names[indexOf(row.kind())];
-    const auto add = [&](const std::string& name) {
-      names.try_emplace(migration::folded(name), &row);
-    };
+    const auto add = [&](const std::string& name) { names.try_emplace(folded(name), &row); };
     for (const Entry* const entry : {row.match.latest, row.match.old, row.match.base}) {
       if (entry != nullptr) {
         add(entry->kept->object->oidInPlace());
@@ -90,7 +85,7 @@ class Around {
 
   const Verdict* find(Kind kind, const std::string& name) const {
     const Names& names = m_names[indexOf(kind)];
-    const auto found = names.find(migration::folded(name));
+    const auto found = names.find(folded(name));
     return found == names.end() ? nullptr : found->second;
   }
 
@@ -115,9 +110,11 @@ class Around {
 
 }  // namespace
 
-std::vector<SuperiorNode> superiorsAround(const migration::MigrationPlan& plan,
-                                          const ShownDifferences& shown) {
+std::vector<SuperiorNode> superiorsAround(const MigrationPlan& plan,
+                                          const std::vector<const Verdict*>& shown) {
   Around around(plan.threeWay.differences);
   around.choose(shown);
   return around.nodes();
 }
+
+}  // namespace migration
