@@ -1,5 +1,4 @@
-// What README shows of check and show is so, and the manual page and the help of each command know
-// the same options and exit codes.
+// The manual page and the help of each command know the same options and exit codes.
 
 #include <gtest/gtest.h>
 
@@ -7,28 +6,10 @@
 #include <set>
 
 #include "ToolRun.h"
-#include "Transcript.h"
 
 namespace {
 
 using Words = std::set<std::string>;
-
-TEST(Readme, ExampleOfCheckIsTrue) {
-  std::vector<std::string> block;
-  bool isInBlock = false;
-  for (const std::string& line : support::splitLines(support::readWholeFile(README))) {
-    if (line == "```") {
-      isInBlock = false;
-    } else if (line == "$ cat site/V3.user.at") {
-      isInBlock = true;
-    }
-    if (isInBlock) {
-      block.push_back(line);
-    }
-  }
-  const ToolFolder folder;
-  EXPECT_EQ(2, replay(folder, block));
-}
 
 // The options in a text: words that begin with "--".
 Words optionsIn(const std::string& text) {
