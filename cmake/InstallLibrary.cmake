@@ -1,6 +1,7 @@
 # install_library(<header>...): the headers in one flat folder, the shared and the static library with
 # the platform behind them, and the files by which CMake and pkg-config find them. The installed tree
-# can be moved as a whole. A server's own platform is not installed, but referred to.
+# can be moved as a whole. A server's own platform is not installed, but referred to. The components are
+# runtime, development, tool and documentation.
 
 include(CMakePackageConfigHelpers)
 
@@ -22,23 +23,27 @@ function(install_pkg_config template)
   pkg_config_path("${CMAKE_INSTALL_INCLUDEDIR}" pc_includedir)
   get_filename_component(name ${template} NAME_WLE)
   configure_file(${PROJECT_SOURCE_DIR}/cmake/${template} ${PROJECT_BINARY_DIR}/package/${name} @ONLY)
-  install(FILES ${PROJECT_BINARY_DIR}/package/${name} DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
+  install(FILES ${PROJECT_BINARY_DIR}/package/${name} DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig
+          COMPONENT development)
 endfunction()
 
 # install_migration_library(<header>...): the same for the library behind it, in the package of
 # libschema.
 function(install_migration_library)
-  install(FILES ${ARGN} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/libschema-migration)
+  install(FILES ${ARGN} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/libschema-migration
+          COMPONENT development)
   install(TARGETS migration migration_static EXPORT libschemaTargets
-          LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
-          ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR})
+          LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT runtime
+                  NAMELINK_COMPONENT development
+          ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT development)
   install_pkg_config(libschema-migration.pc.in)
 endfunction()
 
 function(install_library)
   set(package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/libschema)
 
-  install(FILES ${ARGN} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/libschema)
+  install(FILES ${ARGN} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/libschema
+          COMPONENT development)
   set(targets schema schema_static)
   set(pc_stand_ins "-lschema-platform")
   set(pc_platform "")
@@ -53,10 +58,12 @@ function(install_library)
     list(APPEND targets schema_platform schema_platform_static)
   endif()
   install(TARGETS ${targets} EXPORT libschemaTargets
-          LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
-          ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR})
+          LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT runtime
+                  NAMELINK_COMPONENT development
+          ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT development)
 
-  install(EXPORT libschemaTargets NAMESPACE libschema:: DESTINATION ${package_dir})
+  install(EXPORT libschemaTargets NAMESPACE libschema:: DESTINATION ${package_dir}
+          COMPONENT development)
   configure_package_config_file(
       ${PROJECT_SOURCE_DIR}/cmake/libschemaConfig.cmake.in
       ${PROJECT_BINARY_DIR}/package/libschemaConfig.cmake
@@ -66,7 +73,7 @@ function(install_library)
       COMPATIBILITY SameMajorVersion)
   install(FILES ${PROJECT_BINARY_DIR}/package/libschemaConfig.cmake
                 ${PROJECT_BINARY_DIR}/package/libschemaConfigVersion.cmake
-          DESTINATION ${package_dir})
+          DESTINATION ${package_dir} COMPONENT development)
 
   install_pkg_config(libschema.pc.in)
 endfunction()

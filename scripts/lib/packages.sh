@@ -5,7 +5,8 @@
 {
   packages_to_build=(g++ cmake ninja-build libcli11-dev libssl-dev libtomlplusplus-dev
     nlohmann-json3-dev)
-  packages_to_test=(libgtest-dev libldap-dev pkg-config python3-jsonschema valgrind man-db)
+  packages_to_test=(libgtest-dev libldap-dev pkg-config python3-jsonschema valgrind man-db
+    devscripts)
   packages_to_check=(clang clang-tidy clang-format libbenchmark-dev)
 }
 

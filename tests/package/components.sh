@@ -1,0 +1,36 @@
+#!/usr/bin/env bash
+# The components of the installation: together they are all of it, and each holds what its package does.
+
+set -euo pipefail
+. "$(dirname "$0")/expect.sh"
+
+rm -rf "$WORK"
+mkdir -p "$WORK"
+cd "$WORK"
+
+# files FOLDER: the files below it, without that which names the kind of the build.
+files() {
+  if [ -d "$1" ]; then
+    (cd "$1" && find . ! -type d | LC_ALL=C sort)
+  fi
+}
+
+for component in runtime development tool documentation; do
+  "$CMAKE" --install "$BUILD" --prefix "$WORK/$component" --component "$component" >log
+done
+expect "files of all components" "$(files "$PREFIX")" \
+  "$(for component in runtime development tool documentation; do files "$component"; done |
+    LC_ALL=C sort)"
+
+lib=$(cd development && dirname "$(find . -name libschema.a)")
+major=${VERSION%%.*}
+expect "runtime" "$(for name in libschema-migration libschema-platform libschema; do
+  printf '%s\n' "$lib/$name.so.$major" "$lib/$name.so.$VERSION"
+done)" "$(files runtime)"
+expect "tool but for manual pages" ./bin/schema-migrate "$(files tool | grep -v '^./share/man/')"
+expect "development outside of its folders" "$(for name in libschema-migration libschema-platform libschema
+do
+  printf '%s\n' "$lib/$name.a" "$lib/$name.so"
+done)" "$(files development | grep -vE '^./include/|/cmake/|/pkgconfig/|^./share/man/')"
+expect "documentation outside of its folder" "" \
+  "$(files documentation | grep -vE '^./share/(doc|man)/' || true)"
