@@ -9,6 +9,7 @@
 #include "Command.h"
 #include "CommandLine.h"
 #include "Messages.h"
+#include "Progress.h"
 #include "Renderers.h"
 #include "RepairRun.h"
 #include "Terminal.h"
@@ -109,14 +110,16 @@ class CheckCommand : public Command {
                     errorLine("--repair takes one DIR; schema-migrate check --help tells how "
                               "it is used"));
     }
+    progress::step("reading and checking");
     const CheckReport report = m_repair.out.empty() ? checkDirectories(m_options)
                                                     : repairDirectory(m_options, m_repair, console);
     std::string failures = renderFailures(report);
     console->complain(&failures);
     const bool isCopyTold = !m_repair.out.empty() && report.failures.empty() && m_format == "text";
-    console->print(
+    const std::string told =
         render(report) +
-        (isCopyTold ? "Written and verified: " + wholePrintable(m_repair.out) + "\n" : ""));
+        (isCopyTold ? "Written and verified: " + wholePrintable(m_repair.out) + "\n" : "");
+    m_format == "text" ? console->printText(told) : console->print(told);
     return report.exitCode;
   }
 
@@ -131,7 +134,7 @@ class CheckCommand : public Command {
     if (m_format == "github") {
       return renderGithub(report);
     }
-    return renderText(report, {m_options.isWithExcerpts, isColourWanted()});
+    return renderText(report, {m_options.isWithExcerpts, isColourWanted(), longestLine()});
   }
 
   CheckOptions m_options;

@@ -2,8 +2,11 @@
 
 #include <algorithm>
 #include <iostream>
+#include <sstream>
 
+#include "DisplayText.h"
 #include "Messages.h"
+#include "Terminal.h"
 
 namespace {
 
@@ -31,7 +34,8 @@ Exit codes:
 Manual: man schema-migrate)";
 
 int usageError(const std::string& text, const std::string& command) {
-  std::cerr << errorLine(text + "; schema-migrate " + command + "--help tells how it is used");
+  std::cerr << asComplaint(
+      errorLine(text + "; schema-migrate " + command + "--help tells how it is used"));
   return kUsage;
 }
 
@@ -50,16 +54,66 @@ std::string emptyOption(int argc, char** argv) {
   return "";
 }
 
+// Help of at most 80 columns.
+class HelpFormatter : public CLI::Formatter {
+ public:
+  std::string make_option(const CLI::Option* option, bool isPositional) const override {
+    return row(make_option_name(option, isPositional) + make_option_opts(option),
+               make_option_desc(option));
+  }
+
+  std::string make_subcommand(const CLI::App* command) const override {
+    return row(command->get_name(), command->get_description());
+  }
+
+  std::string make_footer(const CLI::App* command) const override {
+    std::string text;
+    std::string paragraph;
+    for (std::istringstream lines(command->get_footer() + "\n"); !lines.eof();) {
+      std::string line;
+      std::getline(lines, line);
+      const bool isRunning = !line.empty() && line.front() != ' ' && line.back() != ':';
+      if (isRunning) {
+        paragraph += (paragraph.empty() ? "" : " ") + line;
+        continue;
+      }
+      text += paragraph.empty() ? "" : wrapped("", paragraph, kWidth);
+      paragraph.clear();
+      text += lines.eof() ? "" : fitted(line + "\n", kWidth);
+    }
+    return text;
+  }
+
+ private:
+  static constexpr std::size_t kWidth = 80;
+
+  // What stands on the left, and its description beside it, or below where it is long.
+  static std::string row(const std::string& name, const std::string& description) {
+    constexpr std::size_t kLeft = 28;
+    const std::string left = "  " + name;
+    const bool isBeside = left.size() + 2 <= kLeft;
+    return (isBeside ? "" : left + "\n") +
+           wrapped(padded(isBeside ? left : "", kLeft), description, kWidth);
+  }
+};
+
 // The commands on a command line with the program's own help and version.
 class Program {
  public:
   explicit Program(const Commands& commands) : m_program(kDescription, "schema-migrate") {
     m_program.footer(kFooter);
+    m_program.formatter(std::make_shared<HelpFormatter>());
     m_program.set_help_flag("-h,--help", "print this help");
     m_program.set_version_flag("--version", kVersion, "print the version");
     m_program.require_subcommand(1);
     for (const auto& command : commands) {
       CLI::App* const declared = command->declare(&m_program);
+      declared
+          ->add_option_function<std::string>("--color", wishForColour,
+                                             "colours: always, never, or auto (on a terminal, "
+                                             "unless NO_COLOR is set); auto unless given")
+          ->check(oneOf({"auto", "always", "never"}))
+          ->type_name("WHEN");
       declared->set_help_flag("-h,--help", "print this help");
       m_declared.emplace_back(declared, command.get());
     }

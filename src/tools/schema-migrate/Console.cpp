@@ -5,9 +5,17 @@
 #include <cstdio>
 
 #include "Descriptor.h"
+#include "DisplayText.h"
 #include "Messages.h"
+#include "Progress.h"
+#include "Terminal.h"
+
+std::string asComplaint(const std::string& lines) {
+  return ::isatty(STDERR_FILENO) == 1 ? fitted(lines, terminalWidth()) : lines;
+}
 
 bool Console::write(const std::string& text) {
+  const progress::Silence silence;
   return std::fwrite(text.data(), 1, text.size(), stdout) == text.size() &&
          std::fflush(stdout) == 0;
 }
@@ -18,8 +26,11 @@ void Console::print(const std::string& text) {
   }
 }
 
+void Console::printText(const std::string& text) { print(fitted(text, longestLine())); }
+
 void Console::complain(std::string* text) {
-  if (!writeAll(STDERR_FILENO, *text)) {
+  const progress::Silence silence;
+  if (!writeAll(STDERR_FILENO, asComplaint(*text))) {
     throw Failure(kNotWritten, errorLine("a warning cannot be written to standard error"));
   }
   text->clear();

@@ -25,7 +25,8 @@ it nobody can tell who changed what, and whatever differs is unknown.
 Classes (--class): same, added-by-site, removed-by-site, changed-by-site,
   added-by-release, removed-by-release, changed-by-release,
   changed-by-both-mergeable, changed-by-both-in-conflict, taken, unknown
-Risks (--risk): data (what entries hold already may not fit), structure, cosmetic
+Risks (--risk): data (what entries hold already may not fit), structure,
+  cosmetic
 
 Example:
   schema-migrate diff --base /srv/shipped --from /srv/ldap-old/schema \
@@ -75,9 +76,11 @@ class DiffCommand : public Command {
                           m_filter.changes.end();
     const std::unique_ptr<migration::MigrationPlan> plan = m_options.makePlan();
     const ShownDifferences shown = shownOf(*plan, m_filter);
-    console->print(m_format == "json"
-                       ? renderPlanJson(*plan, shown, "diff")
-                       : renderDifferences(*plan, shown, {isColourWanted(), m_isSummaryOnly}));
+    if (m_format == "json") {
+      console->print(renderPlanJson(*plan, shown, "diff"));
+    } else {
+      console->printText(renderDifferences(*plan, shown, {isColourWanted(), m_isSummaryOnly}));
+    }
     const bool isAllSame =
         std::all_of(shown.begin(), shown.end(), [](const migration::Verdict* verdict) {
           return verdict->outcome == migration::Outcome::kSame;

@@ -7,6 +7,7 @@
 #include <string_view>
 
 #include "Messages.h"
+#include "Progress.h"
 
 namespace {
 
@@ -20,6 +21,7 @@ Removals everything;
 
 extern "C" void removeAndEnd(int /*signal*/) {
   const std::string_view message = everything.run() ? kInPlace : kNotInPlace;
+  progress::erase();
   writeAll(STDERR_FILENO, message);
   ::_exit(kNotWritten);
 }

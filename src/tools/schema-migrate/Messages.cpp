@@ -1,24 +1,13 @@
 #include "Messages.h"
 
-#include <array>
-#include <cstdio>
 #include <cstring>
+
+#include "DisplayText.h"
+#include "Terminal.h"
 
 namespace {
 
 constexpr char kProgram[] = "schema-migrate";
-
-// A backslash is left as it is, so that a text is not changed a second time.
-void appendPrintable(char c, std::string* text) {
-  const auto byte = static_cast<unsigned char>(c);
-  if (byte >= 0x20 && byte < 0x7f) {
-    *text += c;
-    return;
-  }
-  std::array<char, 8> escaped{};
-  std::snprintf(escaped.data(), escaped.size(), "\\x%02X", static_cast<unsigned>(byte));
-  *text += escaped.data();
-}
 
 // Whatever the names of files may hold, it is one line.
 std::string line(const std::string& place, const char* severity, const std::string& text) {
@@ -62,20 +51,7 @@ std::string counted(std::uint64_t count, const std::string& noun) {
 
 std::string printable(const std::string& text) {
   constexpr std::size_t kLongest = 200;
-  std::string result;
-  for (const char c : text) {
-    if (result.size() >= kLongest) {
-      return result + "...";
-    }
-    appendPrintable(c, &result);
-  }
-  return result;
+  return asShown(text, isUtf8Terminal(), kLongest);
 }
 
-std::string wholePrintable(std::string_view text) {
-  std::string result;
-  for (const char c : text) {
-    appendPrintable(c, &result);
-  }
-  return result;
-}
+std::string wholePrintable(std::string_view text) { return asShown(text, isUtf8Terminal()); }

@@ -56,8 +56,8 @@ std::string orList(const std::string& oid, const std::string& purpose);
 // "1 definition", "2 definitions".
 std::string counted(std::uint64_t count, const std::string& noun);
 
-// Bytes that a terminal could take for a command, and those of 128 and more, as \xNN; a long text
-// is cut short.
+// Bytes that a terminal could take for a command as \xNN, and those of 128 and more unless they are
+// characters that the terminal shows; a long text is cut short.
 std::string printable(const std::string& text);
 
 // The same, not cut short.

@@ -50,7 +50,8 @@ Lists of OIDs:
 
 Example:
   schema-migrate migrate --from /srv/ldap-old/schema --to /srv/ldap-new/schema \
-      --out /srv/migrated-schema --exclude-oids exclude.oids --withdraw withdraw.oids
+      --out /srv/migrated-schema --exclude-oids exclude.oids \
+      --withdraw withdraw.oids
 
 Exit codes:
   0  done; DIR is in place

@@ -65,9 +65,12 @@ class PlanCommand : public Command {
     filter.isWithSame = m_format == "json";
     const ShownDifferences shown = shownOf(*plan, filter);
     const PlanStyle style{isColourWanted(), false};
-    console->print(m_format == "json" ? renderPlanJson(*plan, shown, "plan")
-                                      : renderDifferences(*plan, shown, style) + "\n" +
-                                            renderReadiness(*plan, style));
+    if (m_format == "json") {
+      console->print(renderPlanJson(*plan, shown, "plan"));
+    } else {
+      console->printText(renderDifferences(*plan, shown, style) + "\n" +
+                         renderReadiness(*plan, style));
+    }
     std::string lines = whyNotReady(*plan);
     console->complain(&lines);
     return plan->isReady() ? kDone : kRefused;

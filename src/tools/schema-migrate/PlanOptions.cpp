@@ -2,6 +2,7 @@
 
 #include "CommandLine.h"
 #include "Messages.h"
+#include "Progress.h"
 
 void PlanOptions::declareInputs(CLI::App* command) {
   command->add_option("--from", request.old, "directory with the old installation's V3.* files")
@@ -47,6 +48,7 @@ std::unique_ptr<migration::MigrationPlan> PlanOptions::makePlan() const {
   wanted.prefer = m_prefer == "old"   ? migration::Prefer::kOld
                   : m_prefer == "new" ? migration::Prefer::kNew
                                       : migration::Prefer::kNothing;
+  wanted.onStep = progress::step;
   std::unique_ptr<migration::MigrationPlan> plan = migration::makePlan(wanted);
   if (!plan->failures.empty()) {
     std::string lines;

@@ -10,6 +10,7 @@
 #include "OutputDirectory.h"
 #include "PlanReport.h"
 #include "PrivatePlace.h"
+#include "Progress.h"
 #include "RunPlaces.h"
 #include "Terminal.h"
 #include "TextOutput.h"
@@ -55,6 +56,7 @@ std::vector<NamedText> execute(const MigrationPlan& plan, bool isInLibraryLayout
   for (const char* const folder : migration::kExecutionFolders) {
     place->makeDirectory(folder);
   }
+  progress::step("carrying the plan out");
   Execution execution = migration::execute(plan.request, plan.threeWay, place->path());
   if (!execution.failures.empty()) {
     throw Failure(kNotWritten, linesOf(execution.failures) +
@@ -102,8 +104,11 @@ void migrateByPlan(const MigrateOptions& options, const PlanOptions& planOptions
   filter.isWithSame = runOptions.isJson;
   const ShownDifferences shown = shownOf(*plan, filter);
   const PlanStyle style{isColourWanted(), false};
-  console->print(runOptions.isJson ? renderPlanJson(*plan, shown, "migrate")
-                                   : renderDifferences(*plan, shown, style));
+  if (runOptions.isJson) {
+    console->print(renderPlanJson(*plan, shown, "migrate"));
+  } else {
+    console->printText(renderDifferences(*plan, shown, style));
+  }
   refuseUnlessReady(*plan);
   PrivatePlace place(privatePlaceFor(options.out, sizeOf(*plan)), removals, &warnings);
   console->complain(&warnings);
@@ -114,6 +119,7 @@ void migrateByPlan(const MigrateOptions& options, const PlanOptions& planOptions
     }
     return;
   }
+  progress::step("writing and verifying");
   publishTexts(
       texts, [&](const std::string& name) { return modeOf(*plan, name); }, &place, &output);
   if (!runOptions.isJson &&

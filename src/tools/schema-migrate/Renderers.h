@@ -3,6 +3,7 @@
 #ifndef SCHEMA_MIGRATE_RENDERERS_H
 #define SCHEMA_MIGRATE_RENDERERS_H
 
+#include <cstddef>
 #include <string>
 
 #include "CheckReport.h"
@@ -10,6 +11,7 @@
 struct TextStyle {
   bool isWithExcerpts = false;  // the source line with a caret below it
   bool isColoured = false;
+  std::size_t width = std::string::npos;  // of the excerpts at most
 };
 
 // "FILE:LINE:COLUMN: error: TEXT [RULE]" a line each, then a count.

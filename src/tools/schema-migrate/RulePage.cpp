@@ -2,34 +2,19 @@
 
 #include <libschema-migration/Settings.h>
 
+#include <algorithm>
 #include <string_view>
 
+#include "DisplayText.h"
 #include "Messages.h"
+#include "Terminal.h"
 
 namespace {
 
-constexpr std::size_t kWidth = 79;
-
-// The words of `text` in lines of at most kWidth columns; `first` before the first one, and as many
-// blanks before the others.
-std::string wrapped(const std::string& first, std::string_view text) {
-  std::string result = first;
-  std::size_t column = first.size();
-  bool isLineEmpty = true;
-  while (!text.empty()) {
-    const std::string_view word = text.substr(0, text.find(' '));
-    text.remove_prefix(std::min(text.size(), word.size() + 1));
-    if (!isLineEmpty && column + 1 + word.size() > kWidth) {
-      result += "\n" + std::string(first.size(), ' ');
-      column = first.size();
-      isLineEmpty = true;
-    }
-    result += isLineEmpty ? "" : " ";
-    result += word;
-    column += word.size() + (isLineEmpty ? 0 : 1);
-    isLineEmpty = false;
-  }
-  return result + "\n";
+// The words of `text`, `first` before them.
+std::string inLines(const std::string& first, std::string_view text) {
+  constexpr std::size_t kWidest = 79;
+  return wrapped(first, text, std::min(longestLine(), kWidest));
 }
 
 // The lines of a file, indented; a last one without its line end says so.
@@ -58,9 +43,9 @@ std::string renderFiles(const std::vector<migration::ExampleFile>& files) {
 
 std::string renderPage(const migration::RuleInfo& rule) {
   return std::string(rule.id) + " " + rule.name + " (" +
-         std::string(migration::wordOf(rule.severity)) + ")\n\n" + wrapped("  ", rule.what) +
-         "\n  An example:\n" + renderFiles(rule.example) + "\n" + wrapped("  Why: ", rule.why) +
-         "\n" + wrapped("  How to mend it: ", rule.mend) + "\n  This is no " + rule.id + ":\n" +
+         std::string(migration::wordOf(rule.severity)) + ")\n\n" + inLines("  ", rule.what) +
+         "\n  An example:\n" + renderFiles(rule.example) + "\n" + inLines("  Why: ", rule.why) +
+         "\n" + inLines("  How to mend it: ", rule.mend) + "\n  This is no " + rule.id + ":\n" +
          renderFiles(rule.nearMiss);
 }
 
@@ -70,7 +55,7 @@ std::string renderList(const std::vector<const migration::RuleInfo*>& rules) {
     std::string first =
         std::string(rule->id) + "  " + std::string(migration::wordOf(rule->severity));
     first.resize(15, ' ');
-    result += wrapped(first, rule->what);
+    result += inLines(first, rule->what);
   }
   return result;
 }

@@ -23,7 +23,8 @@ Without a name, lists all definitions. DIR is only read.
 Examples:
   schema-migrate show /srv/ldap/schema person --inherited --refs
   schema-migrate show /srv/ldap/schema --kind attribute-type --match 'cfg*'
-  schema-migrate show /srv/ldap/schema --tree --format dot | dot -Tsvg -o classes.svg
+  schema-migrate show /srv/ldap/schema --tree --format dot \
+      | dot -Tsvg -o classes.svg
 
 Exit codes:
   0  printed

@@ -1,8 +1,10 @@
 #include <algorithm>
 #include <set>
 
+#include "DisplayText.h"
 #include "Messages.h"
 #include "ShowReport.h"
+#include "Terminal.h"
 
 namespace {
 
@@ -19,14 +21,12 @@ std::string lineOf(const ShownPlace& place) {
 std::string columns(const std::vector<ShownClause>& clauses, const char* word) {
   std::size_t width = 0;
   for (const ShownClause& clause : clauses) {
-    width = std::max(width, wholePrintable(clause.text).size());
+    width = std::max(width, displayWidth(wholePrintable(clause.text)));
   }
   std::string text;
   for (const ShownClause& clause : clauses) {
-    std::string first = wholePrintable(clause.text);
-    first.resize(width, ' ');
-    text += "    " + first + "  " + word + " " + wholePrintable(clause.from.title) + ", " +
-            placeOf(clause.from) + "\n";
+    text += "    " + padded(wholePrintable(clause.text), width) + "  " + word + " " +
+            wholePrintable(clause.from.title) + ", " + placeOf(clause.from) + "\n";
   }
   return text.empty() ? "    nothing\n" : text;
 }
@@ -41,10 +41,10 @@ std::string textOf(const ShownDefinition& definition, const ShowReport& report) 
     text += "  not in use; the server uses " + placeOf(place) + "\n";
   }
   if (report.isWithInherited) {
-    text += "  inherits:\n" + columns(definition.inherited, "from");
+    text += fitted("  inherits:\n" + columns(definition.inherited, "from"), longestLine());
   }
   if (report.isWithReferrers) {
-    text += "  is referred to by:\n" + columns(definition.referrers, "of");
+    text += fitted("  is referred to by:\n" + columns(definition.referrers, "of"), longestLine());
   }
   return text;
 }
@@ -72,7 +72,7 @@ std::string quoted(const std::string& name) {
 std::string renderText(const ShowReport& report) {
   std::string text;
   for (const ShownPlace& place : report.list) {
-    text += lineOf(place);
+    text += fitted(lineOf(place), longestLine());
   }
   for (const ShownDefinition& definition : report.definitions) {
     text += text.empty() ? "" : "\n";

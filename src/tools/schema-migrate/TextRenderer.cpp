@@ -1,5 +1,6 @@
 #include <string_view>
 
+#include "DisplayText.h"
 #include "Messages.h"
 #include "Renderers.h"
 
@@ -50,11 +51,53 @@ class TextRenderer {
     return wholePrintable(result);
   }
 
+  // How many bytes of `text`, from its front or from its end, fit into *room columns, which get
+  // fewer by that.
+  static std::size_t fitting(std::string_view text, bool isFromEnd, std::size_t* room) {
+    const auto isInside = [&](std::size_t at) {
+      return at < text.size() && (static_cast<unsigned char>(text[at]) & 0xC0U) == 0x80;
+    };
+    std::size_t count = 0;
+    while (count < text.size()) {
+      std::size_t next = count + 1;
+      while (isFromEnd ? next < text.size() && isInside(text.size() - next) : isInside(next)) {
+        ++next;
+      }
+      const std::size_t at = isFromEnd ? text.size() - next : count;
+      const std::size_t width = displayWidth(shown(text.substr(at, next - count)));
+      if (width > *room) {
+        break;
+      }
+      *room -= width;
+      count = next;
+    }
+    return count;
+  }
+
+  // A line, with a caret below its place; of one that is too wide what stands around it.
   void excerpt(const ReportedFinding& reported) {
-    const std::string_view whole = reported.excerpt;
-    const std::string before = shown(whole.substr(0, reported.caret));
-    m_text += "  " + before + shown(whole.substr(reported.caret)) + "\n";
-    m_text += std::string(before.size() + 2, ' ');
+    constexpr char kCut[] = "...";
+    constexpr std::size_t kIndent = 2;
+    std::string_view before = std::string_view(reported.excerpt).substr(0, reported.caret);
+    std::string_view behind = std::string_view(reported.excerpt).substr(reported.caret);
+    const bool isTooWide = displayWidth(shown(reported.excerpt)) + kIndent > m_style.width;
+    std::string start;
+    std::string end;
+    if (isTooWide) {
+      const std::size_t cuts = kIndent + 2 * (sizeof kCut - 1);
+      const std::size_t whole = m_style.width > cuts ? m_style.width - cuts : 1;
+      std::size_t room = whole / 2;
+      const std::size_t left = fitting(before, true, &room);
+      room += whole - whole / 2;
+      const std::size_t right = fitting(behind, false, &room);
+      start = left < before.size() ? kCut : "";
+      end = right < behind.size() ? kCut : "";
+      before.remove_prefix(before.size() - left);
+      behind = behind.substr(0, right);
+    }
+    start += shown(before);
+    m_text += "  " + start + shown(behind) + end + "\n";
+    m_text += std::string(displayWidth(start) + kIndent, ' ');
     coloured("1;32", "^");
     m_text += '\n';
   }

@@ -14,6 +14,8 @@
 #include "Console.h"
 #include "Interruption.h"
 #include "Messages.h"
+#include "Progress.h"
+#include "Terminal.h"
 
 namespace {
 
@@ -41,6 +43,7 @@ void giveBackLongTexts() {
 int main(int argc, char** argv) {
   holdStandardStreams();
   giveBackLongTexts();
+  noteLocale();
   int exitCode = kDone;
   const Commands commands = allCommands();
   Command* const command = parseCommandLine(argc, argv, commands, &exitCode);
@@ -58,15 +61,20 @@ int main(int argc, char** argv) {
   interruption::install();
   try {
     Console console;
-    return command->run(&console);
+    const int ended = command->run(&console);
+    progress::end();
+    return ended;
   } catch (const Failure& failure) {
-    std::cerr << failure.what();
+    progress::end();
+    std::cerr << asComplaint(failure.what());
     return failure.exitCode();
   } catch (const std::bad_alloc&) {
+    progress::end();
     std::cerr << errorLine("there is not enough memory; nothing was written");
     return kNotWritten;
   } catch (const std::exception& error) {
-    std::cerr << errorLine(error.what());
+    progress::end();
+    std::cerr << asComplaint(errorLine(error.what()));
     return kNotWritten;
   }
 }
