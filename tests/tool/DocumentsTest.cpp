@@ -82,8 +82,8 @@ std::string text(const Words& words) {
 
 TEST(Manual, KnowsTheOptionsThatHelpKnows) {
   const std::pair<const char*, const char*> kCommands[] = {
-      {"check", "CHECK"},     {"show", "SHOW"}, {"explain", "EXPLAIN"},
-      {"migrate", "MIGRATE"}, {"diff", "DIFF"}, {"plan", "PLAN"}};
+      {"check", "CHECK"}, {"show", "SHOW"}, {"explain", "EXPLAIN"}, {"migrate", "MIGRATE"},
+      {"diff", "DIFF"},   {"plan", "PLAN"}, {"verify", "VERIFY"}};
   for (const auto& [command, section] : kCommands) {
     const Words ofHelp = optionsOfHelp(command);
     EXPECT_NE(0U, ofHelp.count("--help")) << command;
@@ -123,6 +123,7 @@ TEST(Manual, KnowsTheExitCodesThatHelpKnows) {
   EXPECT_EQ("0 2 5 ", text(exitCodesOfHelp("explain")));
   EXPECT_EQ("0 2 3 4 5 ", text(exitCodesOfHelp("migrate")));
   EXPECT_EQ("0 1 2 3 4 5 ", text(exitCodesOfHelp("diff")));
+  EXPECT_EQ("0 1 2 3 5 ", text(exitCodesOfHelp("verify")));
   EXPECT_EQ("0 2 3 4 5 ", text(exitCodesOfHelp("plan")));
 }
 

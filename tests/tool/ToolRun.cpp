@@ -169,6 +169,11 @@ pid_t ToolFolder::startMigrate(const std::string& old, const std::string& out,
                captured("out", out), captured("err", out), prepare);
 }
 
+pid_t ToolFolder::startRun(const std::vector<std::string>& arguments, const std::string& name,
+                           const std::function<void()>& prepare) const {
+  return start(arguments, captured("out", name), captured("err", name), prepare);
+}
+
 std::string ToolFolder::printedBy(const std::string& out) const {
   return withoutPath(support::readWholeFile(captured("out", out)));
 }

@@ -50,6 +50,9 @@ class ToolFolder {
   // printedBy(out) and complaintsOf(out) when it has ended.
   pid_t startMigrate(const std::string& old, const std::string& out,
                      const std::function<void()>& prepare = nullptr) const;
+  // Any run, not waited for; its streams are told by `name`.
+  pid_t startRun(const std::vector<std::string>& arguments, const std::string& name,
+                 const std::function<void()>& prepare = nullptr) const;
   std::string printedBy(const std::string& out) const;
   std::string complaintsOf(const std::string& out) const;
 

@@ -33,5 +33,6 @@ std::unique_ptr<Command> makeExplainCommand();
 std::unique_ptr<Command> makeMigrateCommand();
 std::unique_ptr<Command> makePlanCommand();
 std::unique_ptr<Command> makeShowCommand();
+std::unique_ptr<Command> makeVerifyCommand();
 
 #endif  // SCHEMA_MIGRATE_COMMAND_H

@@ -25,7 +25,8 @@ Example:
 
 Exit codes:
   0  done
-  1  check has findings, diff shows differences, or show does not know a name
+  1  check has findings, diff or verify shows differences, or show does not know a
+     name
   2  the command line is wrong
   3  an input is missing, unreadable, too large or cannot be parsed
   4  refused: a definition cannot be migrated, or is undecided; nothing was written
@@ -167,6 +168,7 @@ Commands allCommands() {
   commands.push_back(makeMigrateCommand());
   commands.push_back(makePlanCommand());
   commands.push_back(makeShowCommand());
+  commands.push_back(makeVerifyCommand());
   return commands;
 }
 

@@ -8,6 +8,7 @@
 #include "CommandLine.h"
 #include "Messages.h"
 #include "NewFile.h"
+#include "PlanFile.h"
 #include "PlanOptions.h"
 #include "PlanReport.h"
 #include "Terminal.h"
@@ -28,16 +29,24 @@ clause by clause; a clause that both changed in two ways has to be decided.
 --template writes a file with an entry for each definition that is undecided: fill it
 in, and give it to --decisions.
 
+--save writes the plan as one JSON document: every definition with what comes of
+it and why, the SHA-256 of every file that it was made from, the options, and the
+version of this program. migrate --plan carries it out as long as all of that
+holds, from any directory, as the paths in it are absolute; verify compares an
+output with it. The file appears whole or not at all. A saved plan that has the
+name already is replaced, any other file is not. A plan that is not ready is
+saved, too, and migrate refuses it.
+
 Example:
   schema-migrate plan --base /srv/shipped --from /srv/ldap-old/schema \
-      --to /srv/ldap-new/schema --template decisions.toml
+      --to /srv/ldap-new/schema --decisions decisions.toml --save plan.json
 
 Exit codes:
   0  ready: everything is decided
   2  the command line is wrong
   3  an input is missing, unreadable, too large or cannot be parsed
   4  something is undecided, or refused
-  5  the report, or the file for --template, cannot be written)";
+  5  the report, or the file for --template or --save, cannot be written)";
 
 class PlanCommand : public Command {
  public:
@@ -50,6 +59,9 @@ class PlanCommand : public Command {
                      "write a decisions file to fill in; FILE must not exist")
         ->check(notEmpty())
         ->type_name("FILE");
+    plan->add_option("--save", m_save, "write the plan, for migrate --plan and for verify")
+        ->check(notEmpty())
+        ->type_name("PLAN");
     plan->add_option("--format", m_format, "text or json")
         ->check(oneOf({"text", "json"}))
         ->type_name("FORMAT");
@@ -57,9 +69,16 @@ class PlanCommand : public Command {
   }
 
   int run(Console* console) override {
+    if (!m_save.empty()) {
+      refuseUnlessPlanCanBeSaved(m_save);
+      m_options.makePathsAbsolute();
+    }
     const std::unique_ptr<migration::MigrationPlan> plan = m_options.makePlan();
     if (!m_template.empty()) {
       writeNewFile(m_template, migration::decisionsTemplate(*plan));
+    }
+    if (!m_save.empty()) {
+      savePlan(*plan, m_save);
     }
     DifferenceFilter filter;
     filter.isWithSame = m_format == "json";
@@ -79,6 +98,7 @@ class PlanCommand : public Command {
  private:
   PlanOptions m_options;
   std::string m_template;
+  std::string m_save;
   std::string m_format = "text";
 };
 

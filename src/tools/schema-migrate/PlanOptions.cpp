@@ -1,5 +1,7 @@
 #include "PlanOptions.h"
 
+#include <filesystem>
+
 #include "CommandLine.h"
 #include "Messages.h"
 #include "Progress.h"
@@ -41,6 +43,23 @@ void PlanOptions::declareDecisions(CLI::App* command) {
 
 bool PlanOptions::hasBaseOrDecisions() const {
   return !request.base.empty() || !request.decisions.empty() || !m_prefer.empty();
+}
+
+void PlanOptions::makePathsAbsolute() {
+  const auto makeAbsolute = [](std::string* path) {
+    if (!path->empty()) {
+      *path = std::filesystem::absolute(*path).string();
+    }
+  };
+  for (std::string* const path :
+       {&request.base, &request.old, &request.latest, &request.withdrawList}) {
+    makeAbsolute(path);
+  }
+  for (std::vector<std::string>* const paths : {&request.excludeLists, &request.decisions}) {
+    for (std::string& path : *paths) {
+      makeAbsolute(&path);
+    }
+  }
 }
 
 std::unique_ptr<migration::MigrationPlan> PlanOptions::makePlan() const {

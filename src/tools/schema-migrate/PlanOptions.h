@@ -17,6 +17,9 @@ class PlanOptions {
 
   bool hasBaseOrDecisions() const;
 
+  // So that what outlives the run, a saved plan or a record, can be used from any directory.
+  void makePathsAbsolute();
+
   // Reads the inputs and works the plan out. Throws a Failure when an input cannot be had.
   std::unique_ptr<migration::MigrationPlan> makePlan() const;
 

@@ -1,0 +1,77 @@
+#include "PlanFile.h"
+
+#include <libschema-migration/InputFiles.h>
+#include <libschema-migration/PlanDocument.h>
+#include <sys/stat.h>
+
+#include <utility>
+
+#include "Messages.h"
+#include "NewFile.h"
+
+namespace {
+
+std::string linesOf(const migration::Failures& failures) {
+  std::string lines;
+  for (const migration::Failure& failure : failures) {
+    lines += failure.line == 0
+                 ? errorLine(failure.file, failure.text)
+                 : errorLine(placeOf(failure.file, {failure.line, failure.column}), failure.text);
+  }
+  return lines;
+}
+
+std::unique_ptr<migration::Source> readPlanFile(const std::string& path,
+                                                migration::Failures* failures) {
+  // A plan tells of every definition more than the definition says.
+  constexpr std::uint64_t kMost = std::uint64_t{1} << 33;
+  return migration::readSource(path, kMost, failures);
+}
+
+}  // namespace
+
+void refuseUnlessPlanCanBeSaved(const std::string& path) {
+  struct stat status {};
+  if (::lstat(path.c_str(), &status) != 0) {
+    return;
+  }
+  migration::Failures failures;
+  const std::unique_ptr<migration::Source> source =
+      S_ISREG(status.st_mode) ? readPlanFile(path, &failures) : nullptr;
+  if (source == nullptr || !migration::readSavedPlan(*source, &failures)) {
+    throw Failure(kNotWritten,
+                  errorLine(path,
+                            "exists and is no saved plan, so it is not replaced; name a new "
+                            "file"));
+  }
+}
+
+void savePlan(const migration::MigrationPlan& plan, const std::string& path) {
+  const std::string foreign = migration::pathNotForDocuments(plan);
+  if (!foreign.empty()) {
+    throw Failure(kNotWritten, errorLine(path, "cannot be written: the path \"" + foreign +
+                                                   "\" is not UTF-8, and a plan cannot hold it"));
+  }
+  refuseUnlessPlanCanBeSaved(path);
+  struct stat status {};
+  const Over over = ::lstat(path.c_str(), &status) == 0 ? Over::kWhatIsThere : Over::kNothing;
+  writeNewFile(path, migration::planDocument(plan, {"plan", SCHEMA_MIGRATE_VERSION}), over);
+}
+
+RemadePlan remakePlan(const std::string& path, std::uint64_t limit) {
+  RemadePlan remade;
+  migration::Failures failures;
+  remade.source = readPlanFile(path, &failures);
+  std::optional<migration::SavedPlan> saved;
+  if (remade.source != nullptr) {
+    saved = migration::readSavedPlan(*remade.source, &failures);
+  }
+  if (!saved) {
+    throw Failure(kBadInput, linesOf(failures));
+  }
+  remade.saved = std::move(*saved);
+  remade.saved.request.limits.bytes = limit;
+  remade.again = migration::makePlan(remade.saved.request);
+  remade.changes = migration::changesSince(remade.saved, *remade.again, SCHEMA_MIGRATE_VERSION);
+  return remade;
+}

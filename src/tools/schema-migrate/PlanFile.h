@@ -1,0 +1,32 @@
+// The file that `plan --save` writes and `--plan` reads.
+
+#ifndef SCHEMA_MIGRATE_PLAN_FILE_H
+#define SCHEMA_MIGRATE_PLAN_FILE_H
+
+#include <libschema-migration/MigrationPlan.h>
+#include <libschema-migration/SavedPlan.h>
+
+#include <cstdint>
+#include <memory>
+#include <string>
+
+// Throws a Failure unless a plan may be saved as `path`: it does not exist, or is a saved plan,
+// which is replaced.
+void refuseUnlessPlanCanBeSaved(const std::string& path);
+
+// Saves it, whole or not at all. Throws a Failure when that cannot be done.
+void savePlan(const migration::MigrationPlan& plan, const std::string& path);
+
+// A plan that was read and made again.
+struct RemadePlan {
+  std::unique_ptr<migration::Source> source;
+  migration::SavedPlan saved;
+  std::unique_ptr<migration::MigrationPlan> again;
+  migration::Failures changes;  // what of it holds no longer
+};
+
+// Throws a Failure when `path` cannot be read or is no saved plan. At most `limit` bytes of inputs
+// are read.
+RemadePlan remakePlan(const std::string& path, std::uint64_t limit);
+
+#endif  // SCHEMA_MIGRATE_PLAN_FILE_H
