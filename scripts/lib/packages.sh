@@ -3,10 +3,10 @@
 
 # shellcheck disable=SC2034  # the commands use these
 {
-  packages_to_build=(g++ cmake ninja-build libcli11-dev libssl-dev libtomlplusplus-dev
-    nlohmann-json3-dev)
-  packages_to_test=(libgtest-dev libldap-dev pkg-config python3-jsonschema valgrind man-db
-    devscripts)
+  packages_to_build=(g++ cmake ninja-build libcli11-dev libctemplate-dev libssl-dev libtomlplusplus-dev
+    nlohmann-json3-dev pkg-config)
+  packages_to_test=(libgtest-dev libldap-dev python3-jsonschema valgrind man-db devscripts
+    chromium chromium-driver python3-selenium)
   packages_to_check=(clang clang-tidy clang-format libbenchmark-dev)
 }
 

@@ -120,10 +120,15 @@ TEST(Renderers, Json) {
     "directories": ["dir"],
     "findings": [
       {"rule": "D201", "severity": "error", "file": "dir/V3.user.at", "line": 2, "column": 26,
-       "text": "takes the OID", "definition": "attribute type cn (2.5.4.3)"
-},
+       "text": "takes the OID", "definition": "attribute type cn (2.5.4.3)",
+       "source": {"before": "\tattributetypes=( 1.2 \u00e9 ", "behind": "X-ORIGIN 'x' )"}},
       {"rule": "I702", "severity": "warning", "file": "dir/V3,100%:", "line": 0, "column": 0,
-       "text": "a\u001b[31m\nb", "definition": ""}],
+       "text": "a\u001b[31m\nb", "definition": "", "source": null}],
+    "rules": [
+      {"id": "D201", "name": "word-becomes-oid",
+       "what": "A word that the reader does not know stands where a clause begins: an X- clause, APPROX, a second word."},
+      {"id": "I702", "name": "file-is-unknown",
+       "what": "The name of a file begins with V3. and is none of the nine."}],
     "accepted": [
       {"rule": "L105", "severity": "error", "file": "dir/V3.user.at", "line": 1, "column": 1,
        "text": "text", "definition": "", "reason": "a remark"}],

@@ -4,14 +4,17 @@
 #include <libschema-migration/Settings.h>
 
 #include <CLI/CLI.hpp>
+#include <optional>
 
 #include "CheckRun.h"
 #include "Command.h"
 #include "CommandLine.h"
+#include "HtmlReport.h"
 #include "Messages.h"
 #include "Progress.h"
 #include "Renderers.h"
 #include "RepairRun.h"
+#include "ReportFile.h"
 #include "Terminal.h"
 
 namespace {
@@ -40,7 +43,7 @@ Exit codes:
   2  the command line is wrong
   3  an input cannot be read, or the library would never come to its end; the
      findings in the others are told all the same
-  5  the report, or OUT, cannot be written)";
+  5  the report, OUT, or the file for --html cannot be written)";
 
 std::string ruleProblem(const std::string& word) {
   const std::size_t at = word.find('=');
@@ -85,6 +88,7 @@ class CheckCommand : public Command {
     check->add_option("--format", m_format, "text, json, sarif or github")
         ->check(oneOf({"text", "json", "sarif", "github"}))
         ->type_name("FORMAT");
+    addHtml(check, &m_html);
     check->add_flag("--context", m_isWithContext,
                     "show the line of each finding, as on a terminal");
     check
@@ -100,7 +104,9 @@ class CheckCommand : public Command {
 
   int run(Console* console) override {
     m_options.doWarningsFail = m_failOn == "warning";
-    m_options.isWithExcerpts = m_format == "text" && (m_isWithContext || isOnTerminal());
+    const bool isJson = m_format == "json";
+    const bool isWithContext = m_format == "text" && (m_isWithContext || isOnTerminal());
+    m_options.isWithExcerpts = isWithContext || isJson || !m_html.empty();
     for (const std::string& word : m_rules) {
       const std::size_t at = word.find('=');
       migration::severityOf(word.substr(at + 1), &m_options.severities[word.substr(0, at)]);
@@ -110,21 +116,29 @@ class CheckCommand : public Command {
                     errorLine("--repair takes one DIR; schema-migrate check --help tells how "
                               "it is used"));
     }
+    std::optional<ReportFile> page;
+    if (!m_html.empty()) {
+      page.emplace(m_html, kHtmlBeginning);
+    }
     progress::step("reading and checking");
     const CheckReport report = m_repair.out.empty() ? checkDirectories(m_options)
                                                     : repairDirectory(m_options, m_repair, console);
+    if (page) {
+      page->write(renderCheckHtml(renderJson(report)));
+      page->put();
+    }
     std::string failures = renderFailures(report);
     console->complain(&failures);
     const bool isCopyTold = !m_repair.out.empty() && report.failures.empty() && m_format == "text";
     const std::string told =
-        render(report) +
+        render(report, isWithContext) +
         (isCopyTold ? "Written and verified: " + wholePrintable(m_repair.out) + "\n" : "");
     m_format == "text" ? console->printText(told) : console->print(told);
     return report.exitCode;
   }
 
  private:
-  std::string render(const CheckReport& report) const {
+  std::string render(const CheckReport& report, bool isWithContext) const {
     if (m_format == "json") {
       return renderJson(report);
     }
@@ -134,7 +148,7 @@ class CheckCommand : public Command {
     if (m_format == "github") {
       return renderGithub(report);
     }
-    return renderText(report, {m_options.isWithExcerpts, isColourWanted(), longestLine()});
+    return renderText(report, {isWithContext, isColourWanted(), longestLine()});
   }
 
   CheckOptions m_options;
@@ -142,6 +156,7 @@ class CheckCommand : public Command {
   std::vector<std::string> m_rules;  // "D205=off"
   std::string m_failOn = "error";
   std::string m_format = "text";
+  std::string m_html;
   bool m_isWithContext = false;
 };
 

@@ -2,12 +2,15 @@
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
+#include <optional>
 
 #include "Command.h"
 #include "CommandLine.h"
+#include "HtmlReport.h"
 #include "Messages.h"
 #include "PlanOptions.h"
 #include "PlanReport.h"
+#include "ReportFile.h"
 #include "Terminal.h"
 
 namespace {
@@ -38,7 +41,7 @@ Exit codes:
   2  the command line is wrong
   3  an input is missing, unreadable, too large or cannot be parsed
   4  BASE equals OLD or NEW, and --accept-base is not given
-  5  the report cannot be written)";
+  5  the report, or the file for --html, cannot be written)";
 
 class DiffCommand : public Command {
  public:
@@ -68,16 +71,27 @@ class DiffCommand : public Command {
     diff->add_option("--format", m_format, "text or json")
         ->check(oneOf({"text", "json"}))
         ->type_name("FORMAT");
+    addHtml(diff, &m_html);
     return diff;
   }
 
   int run(Console* console) override {
     m_filter.isWithSame = std::find(m_filter.changes.begin(), m_filter.changes.end(), "same") !=
                           m_filter.changes.end();
+    std::optional<ReportFile> page;
+    if (!m_html.empty()) {
+      page.emplace(m_html, kHtmlBeginning);
+    }
     const std::unique_ptr<migration::MigrationPlan> plan = m_options.makePlan();
     const ShownDifferences shown = shownOf(*plan, m_filter);
-    if (m_format == "json") {
-      console->print(renderPlanJson(*plan, shown, "diff"));
+    const bool isJson = m_format == "json";
+    const std::string document = isJson || page ? renderPlanJson(*plan, shown, "diff") : "";
+    if (page) {
+      page->write(renderPlanHtml(document));
+      page->put();
+    }
+    if (isJson) {
+      console->print(document);
     } else {
       console->printText(renderDifferences(*plan, shown, {isColourWanted(), m_isSummaryOnly}));
     }
@@ -92,6 +106,7 @@ class DiffCommand : public Command {
   PlanOptions m_options;
   DifferenceFilter m_filter;
   std::string m_format = "text";
+  std::string m_html;
   bool m_isSummaryOnly = false;
 };
 

@@ -3,14 +3,17 @@
 #include <libschema-migration/DecisionsTemplate.h>
 
 #include <CLI/CLI.hpp>
+#include <optional>
 
 #include "Command.h"
 #include "CommandLine.h"
+#include "HtmlReport.h"
 #include "Messages.h"
 #include "NewFile.h"
 #include "PlanFile.h"
 #include "PlanOptions.h"
 #include "PlanReport.h"
+#include "ReportFile.h"
 #include "Terminal.h"
 
 namespace {
@@ -46,7 +49,7 @@ Exit codes:
   2  the command line is wrong
   3  an input is missing, unreadable, too large or cannot be parsed
   4  something is undecided, or refused
-  5  the report, or the file for --template or --save, cannot be written)";
+  5  the report, or a file of --template, --save or --html, cannot be written)";
 
 class PlanCommand : public Command {
  public:
@@ -65,10 +68,15 @@ class PlanCommand : public Command {
     plan->add_option("--format", m_format, "text or json")
         ->check(oneOf({"text", "json"}))
         ->type_name("FORMAT");
+    addHtml(plan, &m_html);
     return plan;
   }
 
   int run(Console* console) override {
+    std::optional<ReportFile> page;
+    if (!m_html.empty()) {
+      page.emplace(m_html, kHtmlBeginning);
+    }
     if (!m_save.empty()) {
       refuseUnlessPlanCanBeSaved(m_save);
       m_options.makePathsAbsolute();
@@ -80,14 +88,20 @@ class PlanCommand : public Command {
     if (!m_save.empty()) {
       savePlan(*plan, m_save);
     }
-    DifferenceFilter filter;
-    filter.isWithSame = m_format == "json";
-    const ShownDifferences shown = shownOf(*plan, filter);
+    const bool isJson = m_format == "json";
+    DifferenceFilter all;
+    all.isWithSame = true;
+    const std::string document =
+        isJson || page ? renderPlanJson(*plan, shownOf(*plan, all), "plan") : "";
+    if (page) {
+      page->write(renderPlanHtml(document));
+      page->put();
+    }
     const PlanStyle style{isColourWanted(), false};
-    if (m_format == "json") {
-      console->print(renderPlanJson(*plan, shown, "plan"));
+    if (isJson) {
+      console->print(document);
     } else {
-      console->printText(renderDifferences(*plan, shown, style) + "\n" +
+      console->printText(renderDifferences(*plan, shownOf(*plan, {}), style) + "\n" +
                          renderReadiness(*plan, style));
     }
     std::string lines = whyNotReady(*plan);
@@ -100,6 +114,7 @@ class PlanCommand : public Command {
   std::string m_template;
   std::string m_save;
   std::string m_format = "text";
+  std::string m_html;
 };
 
 }  // namespace

@@ -1,0 +1,191 @@
+#include "HtmlDefinition.h"
+
+#include <libschema-migration/Content.h>
+
+#include <set>
+#include <string>
+#include <vector>
+
+#include "HtmlWords.h"
+
+namespace html {
+
+namespace {
+
+constexpr const char* kSides[] = {"base", "old", "new", "result"};
+constexpr const char* kSideNames[] = {"Base", "Old", "New", "Result"};
+
+using Members = std::set<std::string>;
+
+Members membersOn(const Json& clause, const char* side) {
+  Members members;
+  if (clause.at(side).is_string()) {
+    const std::string name = clause.at("clause");
+    for (const std::string& member : membersOf(name, clause.at(side).get<std::string>())) {
+      members.insert(migration::folded(member));
+    }
+  }
+  return members;
+}
+
+bool isThere(const Json& definition, const char* side) {
+  return !definition.at("places").at(side).is_null();
+}
+
+// How a member of a list on one side differs: from BASE where there is one, else between OLD and
+// NEW.
+Names::Mark markOn(const Json& definition, const Json& clause, const std::string& side) {
+  if (side == "result" || !isList(clause.at("clause").get<std::string>())) {
+    return nullptr;
+  }
+  const bool isFromBase = isThere(definition, "base");
+  const bool isFrom = side == (isFromBase ? "base" : "old");
+  if (!isFrom) {
+    const Members from = membersOn(clause, isFromBase ? "base" : "old");
+    return [from](const std::string& member) {
+      return from.count(migration::folded(member)) == 0 ? '+' : ' ';
+    };
+  }
+  std::vector<Members> others;
+  for (const char* const other : {"old", "new"}) {
+    if (side != other && isThere(definition, other)) {
+      others.push_back(membersOn(clause, other));
+    }
+  }
+  return [others](const std::string& member) {
+    for (const Members& other : others) {
+      if (other.count(migration::folded(member)) == 0) {
+        return '-';
+      }
+    }
+    return ' ';
+  };
+}
+
+std::string textAt(const Json& json, const char* member) { return json.at(member); }
+
+}  // namespace
+
+void DefinitionWriter::addHead(const Json& definition, std::size_t at, Dictionary* row) const {
+  const Word& word = wordIn(classWords(), textAt(definition, "class"));
+  setNumber(row, "N", at);
+  row->SetValue("STYLE_CLASS", word.style);
+  row->SetValue("SIGN", word.sign);
+  row->SetValue("CLASS_WORD", word.said);
+  setText(row, "CLASS", textAt(definition, "class"));
+  setText(row, "RISK", textAt(definition, "risk"));
+  setText(row, "KIND", textAt(definition, "kind"));
+  row->SetValue("KIND_WORD", wordIn(kindWords(), textAt(definition, "kind")).said);
+  setText(row, "NAME", textAt(definition, "name"));
+  setText(row, "OID", "(" + textAt(definition, "oid") + ")");
+  setText(row, "OUTCOME", textAt(definition, "outcome"));
+}
+
+void DefinitionWriter::addReason(const Json& definition, std::size_t at, Dictionary* row) const {
+  m_names.addSentence("REASON", textAt(definition, "reason"), at, row);
+  if (definition.at("kind") == "vendor-extension") {
+    const std::size_t type = m_names.find("attribute-type", textAt(definition, "oid"));
+    if (type != Names::kNowhere) {
+      linkTo(type, row->AddSectionDictionary("EXTENDS"));
+    }
+  }
+  if (!definition.at("notes").empty()) {
+    Dictionary* const notes = row->AddSectionDictionary("NOTES");
+    for (const Json& note : definition.at("notes")) {
+      m_names.addSentence("PART", note, at, notes->AddSectionDictionary("NOTE"));
+    }
+  }
+  if (definition.at("decision").is_string()) {
+    addText(row, "DECIDED", "PLACE", textAt(definition, "decision"));
+  }
+}
+
+void DefinitionWriter::addCell(const Json& definition, const Json& clause, const char* side,
+                               Dictionary* row) const {
+  Dictionary* const cell = row->AddSectionDictionary("CELL");
+  const Json& value = clause.at(side);
+  const bool isResult = std::string_view(side) == "result";
+  const auto put = [&](const char* style, const char* text) {
+    cell->SetValue("CELL_CLASS", style);
+    addText(cell, "PART", "TEXT", text);
+  };
+  if (isResult && !clause.at("decided").get<bool>()) {
+    put("result open", "? undecided");
+  } else if (value.is_string()) {
+    cell->SetValue("CELL_CLASS", side);
+    m_names.addValue(textAt(definition, "kind"), textAt(clause, "clause"), value,
+                     markOn(definition, clause, side), cell);
+  } else {
+    put(isResult ? "result none" : "none", isThere(definition, side) ? "none" : "not there");
+  }
+}
+
+void DefinitionWriter::addClause(const Json& definition, const Json& clause,
+                                 Dictionary* row) const {
+  Dictionary* const line = row->AddSectionDictionary("CLAUSE");
+  setText(line, "CLAUSE_NAME", textAt(clause, "clause"));
+  const Word& risk = wordIn(riskWords(), textAt(clause, "risk"));
+  Dictionary* const told = line->AddSectionDictionary("CLAUSE_RISK");
+  told->SetValue("SIGN", risk.sign);
+  told->SetValue("WORD", risk.said);
+  for (const char* const side : kSides) {
+    if (m_hasBase || side != kSides[0]) {
+      addCell(definition, clause, side, line);
+    }
+  }
+}
+
+void DefinitionWriter::addOthers(const Json& definition, Dictionary* row) const {
+  for (const Json& other : definition.at("otherClauses")) {
+    Dictionary* const clause = row->AddSectionDictionary("OTHER");
+    setText(clause, "CLAUSE_NAME", textAt(other, "clause"));
+    m_names.addValue(textAt(definition, "kind"), textAt(other, "clause"), other.at("value"),
+                     nullptr, clause);
+  }
+}
+
+void DefinitionWriter::addWhole(std::size_t at, Dictionary* section) const {
+  const Json& definition = m_definitions[at];
+  Dictionary* const row = section->AddSectionDictionary("DEFINITION");
+  addHead(definition, at, row);
+  for (const char* const also : {"renamed", "renumbered"}) {
+    if (definition.at(also).get<bool>()) {
+      addText(row, "ALSO", "WORD", also);
+    }
+  }
+  const Word& risk = wordIn(riskWords(), textAt(definition, "risk"));
+  if (risk.word != std::string_view("none")) {
+    addText(row, "RISKY", "RISK_SIGN", risk.sign);
+  }
+  addReason(definition, at, row);
+  std::size_t width = 0;
+  for (std::size_t i = m_hasBase ? 0 : 1; i < 4; ++i, ++width) {
+    Dictionary* const side = row->AddSectionDictionary("SIDE");
+    side->SetValue("SIDE_NAME", kSideNames[i]);
+    setText(side, "PLACE", shortPlace(definition.at("places").at(kSides[i])));
+  }
+  for (const Json& clause : definition.at("clauses")) {
+    addClause(definition, clause, row);
+  }
+  if (!definition.at("otherClauses").empty()) {
+    Dictionary* const alike = row->AddSectionDictionary("ALIKE");
+    alike->SetValue("ALIKE_NAME", definition.at("clauses").empty() ? "" : "= alike");
+    setNumber(alike, "WIDTH", width);
+    addOthers(definition, alike);
+  }
+}
+
+void DefinitionWriter::addLine(std::size_t at, Dictionary* section) const {
+  const Json& definition = m_definitions[at];
+  Dictionary* const row = section->AddSectionDictionary("DEFINITION");
+  addHead(definition, at, row);
+  for (const char* const side : {"new", "old", "base"}) {
+    if (isThere(definition, side)) {
+      setText(row, "PLACE", shortPlace(definition.at("places").at(side)));
+      break;
+    }
+  }
+  addOthers(definition, row);
+}
+
+}  // namespace html
