@@ -4,7 +4,7 @@
 # shellcheck disable=SC2034  # the commands use these
 {
   packages_to_build=(g++ cmake ninja-build libcli11-dev libctemplate-dev libssl-dev libtomlplusplus-dev
-    nlohmann-json3-dev pkg-config)
+    nlohmann-json3-dev pkg-config scdoc)
   packages_to_test=(libgtest-dev libldap-dev python3-jsonschema valgrind man-db devscripts
     chromium chromium-driver python3-selenium)
   packages_to_check=(clang clang-tidy clang-format libbenchmark-dev)

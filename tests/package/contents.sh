@@ -79,7 +79,10 @@ for package in libschema libschema-migration; do
     "$(PKG_CONFIG_PATH=$lib/pkgconfig "$PKG_CONFIG" --modversion "$package")"
 done
 expect "tool" "schema-migrate $VERSION" "$("$PREFIX/bin/schema-migrate" --version)"
-[ -s "$PREFIX/share/man/man1/schema-migrate.1" ] || expect "man page" "schema-migrate.1" "none"
+for page in "$(dirname "$0")"/../../docs/man/*.scd; do
+  page=$(basename "$page" .scd)
+  [ -s "$PREFIX/share/man/man${page##*.}/$page" ] || expect "man page" "$page" "none"
+done
 
 # The installation refers neither to the build nor to the place where it was first.
 if grep -rlE "$BUILD/|$PREFIX.first" "$lib/cmake" "$lib/pkgconfig" "$PREFIX/include"; then
