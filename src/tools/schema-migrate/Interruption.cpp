@@ -16,11 +16,26 @@ constexpr std::string_view kNotInPlace =
     "schema-migrate: error: interrupted; the output directory was not written\n";
 constexpr std::string_view kInPlace =
     "schema-migrate: error: interrupted; the output directory is complete and in place\n";
+// Of two, the output directory comes first.
+constexpr std::string_view kWithoutRecord =
+    "schema-migrate: error: interrupted; the output directory is complete and in place, but the record was not written\n";
+constexpr std::string_view kWithRecord =
+    "schema-migrate: error: interrupted; the output directory and the record are complete and in place\n";
+
+std::string_view messageOf(const Removals::Placed& placed) {
+  if (placed.inPlace == 0) {
+    return kNotInPlace;
+  }
+  if (placed.wanted == 1) {
+    return kInPlace;
+  }
+  return placed.inPlace == placed.wanted ? kWithRecord : kWithoutRecord;
+}
 
 Removals everything;
 
 extern "C" void removeAndEnd(int /*signal*/) {
-  const std::string_view message = everything.run() ? kInPlace : kNotInPlace;
+  const std::string_view message = messageOf(everything.run());
   progress::erase();
   writeAll(STDERR_FILENO, message);
   ::_exit(kNotWritten);

@@ -8,9 +8,11 @@
 
 #include "Descriptor.h"
 #include "Directory.h"
+#include "Interruption.h"
 #include "Messages.h"
 #include "OutputPlace.h"
 #include "OwnDirectory.h"
+#include "Removals.h"
 
 namespace {
 
@@ -38,15 +40,15 @@ class PartialFile {
     if (m_file.isOpen()) {
       ::unlinkat(m_parent.number(), m_partial.c_str(), 0);
     }
+    if (m_entry != nullptr) {
+      Removals::drop(m_entry);
+    }
   }
 
   void write(const std::string& bytes) {
     constexpr int kTries = 100;
-    for (int tries = 1; !m_file.isOpen(); ++tries) {
-      m_partial = "." + m_name + ".partial-" + randomSuffix();
-      m_file = Descriptor(::openat(m_parent.number(), m_partial.c_str(),
-                                   O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0666));
-      if (!m_file.isOpen() && (errno != EEXIST || tries == kTries)) {
+    for (int tries = 1; !open(); ++tries) {
+      if (errno != EEXIST || tries == kTries) {
         failSystem(m_path, "cannot be created");
       }
     }
@@ -80,11 +82,35 @@ class PartialFile {
   }
 
  private:
+  // Entered before it is there, so that an interruption finds it at any time.
+  bool open() {
+    m_partial = "." + m_name + ".partial-" + randomSuffix();
+    m_entry = interruption::removals()->add(m_parent.number(), m_partial, true);
+    if (m_entry == nullptr) {
+      errno = ENAMETOOLONG;
+      return false;
+    }
+    m_file = Descriptor(::openat(m_parent.number(), m_partial.c_str(),
+                                 O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0666));
+    if (!m_file.isOpen()) {
+      const int error = errno;
+      Removals::drop(m_entry);
+      m_entry = nullptr;
+      errno = error;
+      return false;
+    }
+    struct stat status {};
+    ::fstat(m_file.number(), &status);
+    Removals::hold(m_entry, -1, FileIdentity::of(status));
+    return true;
+  }
+
   std::string m_path;
   Directory m_parent;
   std::string m_name;
   std::string m_partial;
   Descriptor m_file;
+  Removals::Entry* m_entry = nullptr;
 };
 
 }  // namespace

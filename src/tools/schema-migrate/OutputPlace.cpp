@@ -58,19 +58,19 @@ std::string parentOf(const std::string& path) {
 }
 
 OutputPlace::OutputPlace(const OutputOptions& options, std::string* warnings)
-    : m_path(withoutLastSlashes(options.path)) {
+    : m_noun(options.noun), m_path(withoutLastSlashes(options.path)) {
   const std::size_t slash = m_path.rfind('/');
   const std::string parent = parentOf(m_path);
   m_name = m_path.substr(slash == std::string::npos ? 0 : slash + 1);
   if (m_name.empty() || m_name == "." || m_name == "..") {
-    throw Failure(kUsage,
-                  errorLine("--out must end in the name of the directory to create, not in \"" +
-                            m_path + "\""));
+    throw Failure(kUsage, errorLine(options.option +
+                                    " must end in the name of the directory to create, not in \"" +
+                                    m_path + "\""));
   }
   m_parent = Directory(parent);
   if (!m_parent.isOpen() && errno == ENOTDIR && ::access(parent.c_str(), F_OK) == 0) {
     fail(m_path,
-         "the output directory cannot be created in " + parent + ", which is not a directory");
+         "the " + m_noun + " cannot be created in " + parent + ", which is not a directory");
   }
   if (!m_parent.isOpen()) {
     failSystem(m_path, "the directory to create it in, " + parent + ", cannot be used");
@@ -87,7 +87,7 @@ OutputPlace::OutputPlace(const OutputOptions& options, std::string* warnings)
 void OutputPlace::checkIsOutside(const std::string& input) const {
   struct stat status {};
   if (::stat(input.c_str(), &status) == 0 && isWithin(m_parent, FileIdentity::of(status))) {
-    throw Failure(kUsage, errorLine("the output directory " + m_path + " lies inside " + input +
+    throw Failure(kUsage, errorLine("the " + m_noun + " " + m_path + " lies inside " + input +
                                     ", which is only read; name a place outside"));
   }
 }
@@ -110,20 +110,20 @@ void OutputPlace::checkParent(bool allowForeign) const {
 void OutputPlace::checkName() {
   if (!m_parent.look(m_name, &m_replaced)) {
     if (errno != ENOENT) {
-      failSystem(m_path, "the output directory cannot be looked at");
+      failSystem(m_path, "the " + m_noun + " cannot be looked at");
     }
     return;
   }
   if (!S_ISDIR(m_replaced.st_mode)) {
-    fail(m_path, "exists and is not a directory; the output directory must be new or empty");
+    fail(m_path, "exists and is not a directory; the " + m_noun + " must be new or empty");
   }
   const Directory existing = m_parent.open(m_name);
   std::vector<std::string> names;
   if (!existing.isOpen() || !existing.list(&names)) {
-    failSystem(m_path, "the output directory cannot be read");
+    failSystem(m_path, "the " + m_noun + " cannot be read");
   }
   if (!names.empty()) {
-    fail(m_path, "the output directory is not empty; name a new or an empty one");
+    fail(m_path, "the " + m_noun + " is not empty; name a new or an empty one");
   }
   m_replacesEmpty = true;
 }

@@ -12,9 +12,11 @@
 
 struct OutputOptions {
   std::string path;
-  std::vector<std::string> inputs;  // directories that it must not lie in
-  bool allowForeignParent = false;  // when others may rename what lies beside it
-  mode_t mask = 022;                // of the permissions of new files and directories
+  std::vector<std::string> inputs;        // directories that it must not lie in
+  bool allowForeignParent = false;        // when others may rename what lies beside it
+  mode_t mask = 022;                      // of the permissions of new files and directories
+  std::string option = "--out";           // what it was named by, and
+  std::string noun = "output directory";  // what messages call it
 };
 
 class OutputPlace {
@@ -46,6 +48,7 @@ class OutputPlace {
   void checkName();
   void findLeftovers(std::string* warnings) const;
 
+  std::string m_noun;
   std::string m_path;
   std::string m_name;
   Directory m_parent{Descriptor(), ""};

@@ -35,8 +35,12 @@ bool isAt(int parent, const char* name, const FileIdentity& identity) {
          FileIdentity::of(status) == identity;
 }
 
+using Remove = bool (*)(int directory, const char* name);
+
+bool removeFile(int directory, const char* name) { return ::unlinkat(directory, name, 0) == 0; }
+
 // Goes through the directory once; returns true when something was removed.
-bool removeOnce(int directory) {
+bool removeOnce(int directory, Remove remove) {
   alignas(KernelEntry) std::array<char, 4096> buffer{};
   bool isAny = false;
   ::lseek(directory, 0, SEEK_SET);
@@ -49,21 +53,40 @@ bool removeOnce(int directory) {
       const char* const entry = buffer.data() + at;
       unsigned short length = 0;
       std::memcpy(&length, entry + offsetof(KernelEntry, length), sizeof length);
-      isAny = ::unlinkat(directory, entry + kNameOffset, 0) == 0 || isAny;
+      isAny = remove(directory, entry + kNameOffset) || isAny;
       at += length;
     }
   }
+}
+
+// A directory with the files in it, but not with directories in it; a link is a file.
+bool removeAny(int directory, const char* name) {
+  if (removeFile(directory, name)) {
+    return true;
+  }
+  const bool isSelfOrParent = name[0] == '.' && (name[1] == 0 || (name[1] == '.' && name[2] == 0));
+  if (isSelfOrParent) {
+    return false;
+  }
+  const int inner = ::openat(directory, name, O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC);
+  if (inner < 0) {
+    return false;
+  }
+  while (removeOnce(inner, removeFile)) {
+  }
+  ::close(inner);
+  return ::unlinkat(directory, name, AT_REMOVEDIR) == 0;
 }
 
 }  // namespace
 
 // What is removed may hide other entries from a listing that is under way.
 void removeFiles(int directory) {
-  while (removeOnce(directory)) {
+  while (removeOnce(directory, removeAny)) {
   }
 }
 
-Removals::Entry* Removals::add(int parent, const std::string& name) {
+Removals::Entry* Removals::add(int parent, const std::string& name, bool isFile) {
   for (Entry& entry : m_entries) {
     if (!entry.isUsed) {
       if (!fill(&entry.name, name)) {
@@ -72,6 +95,7 @@ Removals::Entry* Removals::add(int parent, const std::string& name) {
       entry.parent = parent;
       entry.isHeld = false;
       entry.hasPlace = false;
+      entry.isFile = isFile;
       entry.isUsed = true;
       return &entry;
     }
@@ -93,26 +117,27 @@ bool Removals::setPlace(Entry* entry, const std::string& place) {
 void Removals::drop(Entry* entry) { entry->isUsed = false; }
 
 void Removals::settle(Entry* entry) {
-  m_isSettled = true;
+  ++m_settledCount;
   drop(entry);
 }
 
-bool Removals::run() {
-  bool isInPlace = m_isSettled;
+Removals::Placed Removals::run() {
+  Placed placed{m_settledCount, m_settledCount};
   for (auto entry = m_entries.rbegin(); entry != m_entries.rend(); ++entry) {
     if (!entry->isUsed) {
       continue;
     }
+    placed.wanted += entry->hasPlace ? 1 : 0;
     if (entry->hasPlace && isAt(entry->parent, entry->place.data(), entry->identity)) {
-      isInPlace = true;
+      ++placed.inPlace;
       continue;
     }
-    if (entry->isHeld) {
+    if (entry->isHeld && !entry->isFile) {
       removeFiles(entry->directory);
     }
     if (!entry->isHeld || isAt(entry->parent, entry->name.data(), entry->identity)) {
-      ::unlinkat(entry->parent, entry->name.data(), AT_REMOVEDIR);
+      ::unlinkat(entry->parent, entry->name.data(), entry->isFile ? 0 : AT_REMOVEDIR);
     }
   }
-  return isInPlace;
+  return placed;
 }
