@@ -28,6 +28,7 @@ class Command {
 
 // Each of the commands.
 std::unique_ptr<Command> makeCheckCommand();
+std::unique_ptr<Command> makeDecideCommand();
 std::unique_ptr<Command> makeDiffCommand();
 std::unique_ptr<Command> makeExplainCommand();
 std::unique_ptr<Command> makeMigrateCommand();

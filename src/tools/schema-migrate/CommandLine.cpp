@@ -163,6 +163,7 @@ class Program {
 Commands allCommands() {
   Commands commands;
   commands.push_back(makeCheckCommand());
+  commands.push_back(makeDecideCommand());
   commands.push_back(makeDiffCommand());
   commands.push_back(makeExplainCommand());
   commands.push_back(makeMigrateCommand());

@@ -6,6 +6,8 @@
 #include "Messages.h"
 #include "Progress.h"
 
+#include <string_view>
+
 void PlanOptions::declareInputs(CLI::App* command) {
   command->add_option("--from", request.old, "directory with the old installation's V3.* files")
       ->required()
@@ -60,6 +62,55 @@ void PlanOptions::makePathsAbsolute() {
       makeAbsolute(&path);
     }
   }
+}
+
+std::vector<std::string> PlanOptions::words() const {
+  std::vector<std::string> words;
+  const auto add = [&](const std::string& option, const std::string& value) {
+    if (!value.empty()) {
+      words.push_back(option + " " + shellWord(value));
+    }
+  };
+  add("--from", request.old);
+  add("--to", request.latest);
+  add("--base", request.base);
+  if (request.acceptBase) {
+    words.emplace_back("--accept-base");
+  }
+  for (const std::string& list : request.excludeLists) {
+    add("--exclude-oids", list);
+  }
+  add("--withdraw", request.withdrawList);
+  for (const std::string& file : request.decisions) {
+    add("--decisions", file);
+  }
+  if (request.allowUnused) {
+    words.emplace_back("--allow-unused");
+  }
+  add("--prefer", m_prefer);
+  return words;
+}
+
+std::string shellWord(const std::string& text) {
+  constexpr std::string_view kPlain =
+      "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789_./:=@%+,-";
+  const bool isPrintable = wholePrintable(text) == text;
+  if (isPrintable && text.find_first_not_of(kPlain) == std::string::npos && !text.empty()) {
+    return text;
+  }
+  std::string quoted;
+  for (const char c : text) {
+    quoted += c == '\'' || (!isPrintable && c == '\\') ? std::string("\\") + c : std::string(1, c);
+  }
+  // What a terminal must not get is written so that the shell makes it anew.
+  if (!isPrintable) {
+    return "$'" + wholePrintable(quoted) + "'";
+  }
+  std::string word = "'";
+  for (const char c : text) {
+    word += c == '\'' ? std::string("'\\''") : std::string(1, c);
+  }
+  return word + "'";
 }
 
 std::unique_ptr<migration::MigrationPlan> PlanOptions::makePlan() const {

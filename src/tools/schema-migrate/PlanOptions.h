@@ -8,6 +8,7 @@
 #include <CLI/CLI.hpp>
 #include <memory>
 #include <string>
+#include <vector>
 
 class PlanOptions {
  public:
@@ -20,6 +21,9 @@ class PlanOptions {
   // So that what outlives the run, a saved plan or a record, can be used from any directory.
   void makePathsAbsolute();
 
+  // The options as a command line gives them again, a word or two words each: "--from /srv/old".
+  std::vector<std::string> words() const;
+
   // Reads the inputs and works the plan out. Throws a Failure when an input cannot be had.
   std::unique_ptr<migration::MigrationPlan> makePlan() const;
 
@@ -28,5 +32,8 @@ class PlanOptions {
  private:
   std::string m_prefer;
 };
+
+// The text as one word of a shell.
+std::string shellWord(const std::string& text);
 
 #endif  // SCHEMA_MIGRATE_PLAN_OPTIONS_H
