@@ -333,9 +333,13 @@ void Dialogue::decideAnew(std::vector<Decision> decisions) {
 }
 
 void Dialogue::readAnew() {
-  tell("\n" + m_file.path() +
-       " was changed by somebody else meanwhile. It is read again; nothing was added to it, and "
-       "what was answered before cannot be taken back here any more.\n");
+  tell("\n");
+  m_console.print(wrapped(
+      "",
+      wholePrintable(m_file.path()) +
+          " was changed by somebody else meanwhile. It is read again; nothing was added to it, and "
+          "what was answered before cannot be taken back here any more.",
+      style().width));
   m_file.reopen();
   m_plan = m_makePlan();
   m_asked.clear();

@@ -141,6 +141,7 @@ std::string wrapped(const std::string& first, std::string_view text, std::size_t
 
 std::string fitted(std::string_view text, std::size_t width) {
   constexpr std::size_t kFurther = 4;
+  constexpr std::size_t kLeast = 8;  // columns for what is broken
   std::string result;
   while (!text.empty()) {
     const std::size_t end = text.find('\n');
@@ -152,7 +153,7 @@ std::string fitted(std::string_view text, std::size_t width) {
       const std::size_t indent = std::min(line.find_first_not_of(' '), line.size());
       const std::size_t value = valueColumn(line, indent);
       const std::size_t hanging = value != 0 ? value : indent + kFurther;
-      result += broken(line, hanging > width / 2 ? 0 : hanging, width);
+      result += broken(line, hanging + kLeast > width ? 0 : hanging, width);
     }
     result += end == std::string_view::npos ? "" : "\n";
   }

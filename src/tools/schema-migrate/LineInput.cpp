@@ -36,12 +36,13 @@ void lookForSignals() {
   ::sigprocmask(SIG_SETMASK, &held, nullptr);
 }
 
-// Waits until there is something to read. Signals are held back everywhere else, so that none is
-// missed between a look at what they noted and the wait.
-void await() {
+// Waits until there is something to read, and tells whether the other end is gone. Signals are held
+// back everywhere else, so that none is missed between a look at what they noted and the wait.
+bool awaitInput() {
   const sigset_t open = withoutHeld();
   pollfd input{STDIN_FILENO, POLLIN, 0};
-  ::ppoll(&input, 1, nullptr, &open);
+  return ::ppoll(&input, 1, nullptr, &open) > 0 &&
+         (static_cast<unsigned>(input.revents) & static_cast<unsigned>(POLLHUP)) != 0;
 }
 
 }  // namespace
@@ -64,7 +65,9 @@ LineInput::LineInput() : m_isTerminal(::isatty(STDIN_FILENO) == 1) {
 bool LineInput::fill() {
   std::array<char, 4096> buffer{};
   while (endedBy == 0) {
-    await();
+    if (awaitInput() && m_isTerminal) {
+      endedBy = SIGHUP;
+    }
     if (endedBy != 0) {
       return false;
     }

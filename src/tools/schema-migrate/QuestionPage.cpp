@@ -252,7 +252,7 @@ std::string answerLines(const std::vector<Answer>& answers, const PageStyle& sty
 }
 
 std::string explanation(const Question& question, const std::string& file, const PageStyle& style) {
-  std::string text = "\nWhat each choice leaves in the result:\n";
+  std::string text = "\n" + paragraph(0, "What each choice leaves in the result:", style);
   for (const migration::Choice& choice : question.choices) {
     const Answer answer = answerFor(choice, question);
     text += wrapped("  " + bold(std::string(1, answer.letter), style) + "  ", answer.does + ":",
@@ -291,7 +291,9 @@ std::string explanation(const Question& question, const std::string& file, const
 
 std::string clauseExplanation(const migration::ClauseChoices& clause, const PageStyle& style) {
   const ClauseChange& change = *clause.change;
-  std::string text = "\nWhat each choice makes of " + std::string(nameOf(change.aspect)) + ":\n";
+  std::string text =
+      "\n" +
+      paragraph(0, "What each choice makes of " + std::string(nameOf(change.aspect)) + ":", style);
   const auto add = [&](const std::string& letter, const Values& values) {
     text += labelled(2, letter, shownClause(change, values), style);
   };
