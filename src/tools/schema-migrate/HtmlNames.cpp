@@ -108,9 +108,10 @@ void Names::addValue(std::string_view kind, std::string_view clause, const std::
   for (const std::string& member : membersOf(clause, value)) {
     plain += isFirst ? "" : separator;
     isFirst = false;
-    const std::size_t definition = named.empty() ? kNowhere : find(named, member);
     const char marked = mark ? mark(member) : ' ';
-    if (definition == kNowhere && marked == ' ') {
+    const bool isLink = !named.empty() && marked != kNoLink;
+    const std::size_t definition = isLink ? find(named, member) : kNowhere;
+    if (definition == kNowhere && marked != '+' && marked != '-') {
       plain += member;
       continue;
     }

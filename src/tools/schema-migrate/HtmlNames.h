@@ -31,8 +31,10 @@ class Names {
   // By an OID alone, of an attribute type or an object class.
   std::size_t findOid(std::string_view oid) const;
 
-  // How a member of a list differs: '+' where it is new, '-' where it goes, else ' '.
+  // How a member of a list differs: '+' where it is new, '-' where it goes, else ' '; and kNoLink
+  // for one that leads to its definition in another cell.
   using Mark = std::function<char(const std::string& member)>;
+  static constexpr char kNoLink = '.';
 
   // Adds a section PART for each part of a value of a clause; names of definitions are links.
   void addValue(std::string_view kind, std::string_view clause, const std::string& value,

@@ -14,6 +14,7 @@ namespace html {
 namespace {
 
 constexpr std::size_t kLineHeight = 22;
+constexpr std::size_t kBaseline = 15;  // of the text in it
 constexpr std::size_t kIndent = 22;
 constexpr std::size_t kCharacterWidth = 8;
 constexpr std::size_t kLinesInSlice = 25;
@@ -181,14 +182,15 @@ class Forest {
 };
 
 // The strokes left of a line: down where a line above goes on, and the elbow to its own.
-std::string pathOf(const Line& line) {
-  const std::string middle = std::to_string(kLineHeight / 2);
+std::string pathOf(const Line& line, std::size_t top) {
+  const std::string middle = std::to_string(top + kLineHeight / 2);
   std::string path;
   for (std::size_t i = 0; i < line.hasNext.size(); ++i) {
     const std::string x = std::to_string(i * kIndent + 12);
     const bool isOwn = i + 1 == line.hasNext.size();
     if (line.hasNext[i] || isOwn) {
-      path += "M" + x + " 0V" + (line.hasNext[i] ? std::to_string(kLineHeight) : middle);
+      path += "M" + x + " " + std::to_string(top) + "V" +
+              (line.hasNext[i] ? std::to_string(top + kLineHeight) : middle);
     }
     if (isOwn) {
       path += "M" + x + " " + middle + "h" + std::to_string(kIndent / 2);
@@ -221,18 +223,19 @@ class TreePicture {
     setNumber(slice, "HEIGHT", (last - first) * kLineHeight);
     setNumber(slice, "FIRST", first + 1);
     m_width = 0;
+    std::string path;
     for (std::size_t i = first; i < last; ++i) {
+      const std::size_t top = (i - first) * kLineHeight;
+      path += pathOf(m_lines[i], top);
       Dictionary* const row = slice->AddSectionDictionary("ROW");
-      setNumber(row, "Y", (i - first) * kLineHeight);
+      setNumber(row, "Y", top + kBaseline);
       addLine(m_lines[i], row);
     }
+    setText(slice, "PATH", path);
     setNumber(slice, "WIDTH", m_width);
   }
 
   void addLine(const Line& line, Dictionary* row) {
-    if (!line.hasNext.empty()) {
-      setText(row->AddSectionDictionary("LINES"), "PATH", pathOf(line));
-    }
     const std::size_t x = line.hasNext.size() * kIndent + 4;
     setNumber(row, "X", x);
     std::string text = "\u2026 and " + std::to_string(line.leftOut) + " more that stay the same";

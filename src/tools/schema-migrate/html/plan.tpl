@@ -59,12 +59,12 @@
 {{#DEFINITION}}
 <article class="item {{STYLE_CLASS}}" id="d{{N}}" data-class="{{CLASS}}" data-risk="{{RISK}}" data-kind="{{KIND}}">
 <h3><span class="sign {{STYLE_CLASS}}" aria-hidden="true">{{SIGN}}</span>{{KIND_WORD}} <b>{{NAME}}</b> {{OID}}{{#EXTENDS}} {{#TO}}<a href="#d{{N}}">{{/TO}}of this attribute type{{#TO_END}}</a>{{/TO_END}}{{/EXTENDS}}</h3>
-<p class="what">{{CLASS_WORD}}{{#ALSO}}, {{WORD}}{{/ALSO}} <span aria-hidden="true">→</span> <b>{{OUTCOME}}</b>{{#RISKY}} <span class="risk {{RISK}}">{{RISK_SIGN}} risk: {{RISK}}</span>{{/RISKY}}</p>
+<p class="what">{{CLASS_WORD}}{{#ALSO}}, {{WORD}}{{/ALSO}} → <b>{{OUTCOME}}</b>{{#RISKY}} <span class="risk {{RISK}}">{{RISK_SIGN}} risk: {{RISK}}</span>{{/RISKY}}</p>
 <p>{{#REASON}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/REASON}}</p>
-<table class="sides"><thead><tr><th scope="col">Clause</th>{{#SIDE}}<th scope="col">{{SIDE_NAME}}<br><small>{{PLACE}}</small></th>{{/SIDE}}</tr></thead>
+<table class="sides"><thead><tr><th scope="col">Clause</th>{{#SIDE}}<th scope="col">{{SIDE_NAME}} {{PLACE}}</th>{{/SIDE}}</tr></thead>
 <tbody>
-{{#CLAUSE}}<tr class="differs"><th scope="row">≠ {{CLAUSE_NAME}}<br><small>{{#CLAUSE_RISK}}{{SIGN}} {{WORD}}{{/CLAUSE_RISK}}</small></th>{{#CELL}}<td class="{{CELL_CLASS}}">{{#PART}}{{#ADDED}}<ins>{{/ADDED}}{{#LOST}}<del>{{/LOST}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{#LOST_END}}</del>{{/LOST_END}}{{#ADDED_END}}</ins>{{/ADDED_END}}{{/PART}}</td>{{/CELL}}</tr>{{/CLAUSE}}
-{{#ALIKE}}<tr><th scope="row">{{ALIKE_NAME}}</th><td colspan="{{WIDTH}}">{{#OTHER}}<span><b>{{CLAUSE_NAME}}</b> {{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}</span> {{/OTHER}}</td></tr>{{/ALIKE}}
+{{#CLAUSE}}<tr class="differs"><th scope="row">≠ {{CLAUSE_NAME}}{{#CLAUSE_RISK}} {{SIGN}} {{WORD}}{{/CLAUSE_RISK}}</th>{{#CELL}}<td{{#STYLED}} class="{{CELL_CLASS}}"{{/STYLED}}>{{#PART}}{{#ADDED}}<ins>{{/ADDED}}{{#LOST}}<del>{{/LOST}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{#LOST_END}}</del>{{/LOST_END}}{{#ADDED_END}}</ins>{{/ADDED_END}}{{/PART}}</td>{{/CELL}}</tr>{{/CLAUSE}}
+{{#ALIKE}}<tr><th scope="row">{{ALIKE_NAME}}</th><td colspan="{{WIDTH}}">{{#OTHER}}{{CLAUSE_NAME}} {{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}{{#OTHER_separator}} · {{/OTHER_separator}}{{/OTHER}}</td></tr>{{/ALIKE}}
 </tbody></table>
 {{#NOTES}}<ul class="notes">{{#NOTE}}<li>{{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}</li>{{/NOTE}}</ul>{{/NOTES}}
 {{#DECIDED}}<p>Decided in <code>{{PLACE}}</code></p>{{/DECIDED}}
@@ -79,7 +79,7 @@
 {{#OF_KIND}}
 <h3>{{HEADING}}</h3>
 <div class="tree" tabindex="0" role="group" aria-label="{{HEADING}}, each below its superior">
-{{#SLICE}}<svg width="{{WIDTH}}" height="{{HEIGHT}}" role="group" aria-label="{{HEADING}}, from line {{FIRST}}">{{#ROW}}<g transform="translate(0 {{Y}})">{{#LINES}}<path d="{{PATH}}"/>{{/LINES}}{{#TO}}<a href="#d{{N}}">{{/TO}}<text x="{{X}}" y="15" class="{{STYLE_CLASS}}"><tspan class="sign">{{SIGN}}</tspan> {{TEXT}}{{#SAID}} <tspan class="said">{{WORD}}</tspan>{{/SAID}}</text>{{#TO_END}}</a>{{/TO_END}}</g>{{/ROW}}</svg>{{/SLICE}}
+{{#SLICE}}<svg width="{{WIDTH}}" height="{{HEIGHT}}" role="group" aria-label="{{HEADING}}, from line {{FIRST}}"><path d="{{PATH}}"/>{{#ROW}}{{#TO}}<a href="#d{{N}}">{{/TO}}<text x="{{X}}" y="{{Y}}" class="{{STYLE_CLASS}}">{{SIGN}} {{TEXT}}{{#SAID}} <tspan>{{WORD}}</tspan>{{/SAID}}</text>{{#TO_END}}</a>{{/TO_END}}{{/ROW}}</svg>{{/SLICE}}
 </div>
 {{/OF_KIND}}
 </section>
@@ -98,7 +98,7 @@
 <section id="same" aria-labelledby="same-heading">
 <h2 id="same-heading">Unchanged <span class="number">{{NUMBER}}</span></h2>
 <p>Of these nothing changes: they are the same in OLD and NEW, or gone in both.</p>
-{{#DEFINITION}}<p class="item unchanged" id="d{{N}}" data-class="{{CLASS}}" data-risk="{{RISK}}" data-kind="{{KIND}}"><b>{{NAME}}</b> {{OID}} {{KIND_WORD}}, {{CLASS_WORD}}, {{OUTCOME}} <small>{{PLACE}}</small> {{#OTHER}}<span><b>{{CLAUSE_NAME}}</b> {{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}</span> {{/OTHER}}</p>
+{{#DEFINITION}}<p class="item unchanged" id="d{{N}}" data-class="{{CLASS}}" data-risk="{{RISK}}" data-kind="{{KIND}}"><b>{{NAME}}</b> {{OID}} {{KIND_WORD}}, {{CLASS_WORD}}, {{OUTCOME}} <small>{{PLACE}}</small> {{#OTHER}}{{CLAUSE_NAME}} {{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}{{#OTHER_separator}} · {{/OTHER_separator}}{{/OTHER}}</p>
 {{/DEFINITION}}
 </section>
 {{/SAME}}
