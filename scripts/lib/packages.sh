@@ -6,7 +6,7 @@
   packages_to_build=(g++ cmake ninja-build libcli11-dev libctemplate-dev libssl-dev libtomlplusplus-dev
     nlohmann-json3-dev pkg-config scdoc)
   packages_to_test=(libgtest-dev libldap-dev python3-jsonschema valgrind man-db devscripts
-    chromium chromium-driver python3-selenium)
+    chromium chromium-driver poppler-utils python3-selenium)
   packages_to_check=(clang clang-tidy clang-format libbenchmark-dev)
 }
 

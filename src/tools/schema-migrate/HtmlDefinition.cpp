@@ -137,8 +137,11 @@ void DefinitionWriter::addOthers(const Json& definition, Dictionary* row) const 
   for (const Json& other : definition.at("otherClauses")) {
     Dictionary* const clause = row->AddSectionDictionary("OTHER");
     setText(clause, "CLAUSE_NAME", textAt(other, "clause"));
-    m_names.addValue(textAt(definition, "kind"), textAt(other, "clause"), other.at("value"),
-                     nullptr, clause);
+    // The value of a flag is the clause itself.
+    if (other.at("value") != other.at("clause")) {
+      m_names.addValue(textAt(definition, "kind"), textAt(other, "clause"), other.at("value"),
+                       nullptr, clause);
+    }
   }
 }
 
@@ -156,6 +159,9 @@ void DefinitionWriter::addWhole(std::size_t at, Dictionary* section) const {
     addText(row, "RISKY", "RISK_SIGN", risk.sign);
   }
   addReason(definition, at, row);
+  if (!m_hasBase) {
+    row->ShowSection("NO_BASE");
+  }
   std::size_t width = 0;
   for (std::size_t i = m_hasBase ? 0 : 1; i < 4; ++i, ++width) {
     Dictionary* const side = row->AddSectionDictionary("SIDE");
@@ -167,7 +173,7 @@ void DefinitionWriter::addWhole(std::size_t at, Dictionary* section) const {
   }
   if (!definition.at("otherClauses").empty()) {
     Dictionary* const alike = row->AddSectionDictionary("ALIKE");
-    alike->SetValue("ALIKE_NAME", definition.at("clauses").empty() ? "" : "= alike");
+    alike->SetValue("ALIKE_NAME", definition.at("clauses").empty() ? "Definition" : "= alike");
     setNumber(alike, "WIDTH", width);
     addOthers(definition, alike);
   }
@@ -177,6 +183,7 @@ void DefinitionWriter::addLine(std::size_t at, Dictionary* section) const {
   const Json& definition = m_definitions[at];
   Dictionary* const row = section->AddSectionDictionary("DEFINITION");
   addHead(definition, at, row);
+  setText(row, "WHY", textAt(definition, "reason"));
   for (const char* const side : {"new", "old", "base"}) {
     if (isThere(definition, side)) {
       setText(row, "PLACE", shortPlace(definition.at("places").at(side)));

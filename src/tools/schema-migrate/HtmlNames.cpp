@@ -8,6 +8,11 @@ namespace {
 
 bool isQuoted(std::string_view clause) { return clause == "NAME" || clause == "ALIASES"; }
 
+// What stands between two members of a clause.
+std::string separatorOf(std::string_view clause) {
+  return isQuoted(clause) || clause == "MATCHING" ? " " : " $ ";
+}
+
 // Of which kind the definitions are that a clause names; empty when it names none.
 std::string_view namedKind(std::string_view clause, std::string_view kind) {
   if (clause == "SUP") {
@@ -41,11 +46,12 @@ void addPart(const char* section, const std::string& text, std::size_t definitio
 }  // namespace
 
 bool isList(std::string_view clause) {
-  return clause == "ALIASES" || clause == "SUP" || clause == "MUST" || clause == "MAY";
+  return clause == "ALIASES" || clause == "SUP" || clause == "MUST" || clause == "MAY" ||
+         clause == "MATCHING";
 }
 
 std::vector<std::string> membersOf(std::string_view clause, const std::string& value) {
-  const std::string_view separator = isQuoted(clause) ? " " : " $ ";
+  const std::string separator = separatorOf(clause);
   std::vector<std::string> members;
   std::size_t begin = 0;
   for (std::size_t end = 0; end != std::string::npos; begin = end + separator.size()) {
@@ -101,7 +107,7 @@ void Names::addValue(std::string_view kind, std::string_view clause, const std::
     return;
   }
   const std::string_view named = namedKind(clause, kind);
-  const std::string separator = isQuoted(clause) ? " " : " $ ";
+  const std::string separator = separatorOf(clause);
   // What is neither a link nor marked is one part with its neighbours.
   std::string plain;
   bool isFirst = true;

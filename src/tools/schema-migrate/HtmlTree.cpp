@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "HtmlWords.h"
+#include "Messages.h"
 
 namespace html {
 
@@ -280,8 +281,8 @@ void addTree(const Json& document, const Names& names, Dictionary* page) {
   }
   if (lonely != 0) {
     addText(tree, "NOTHING", "TEXT",
-            std::to_string(lonely) +
-                " of what changes has neither a superior nor a subordinate and is not drawn.");
+            "Not drawn, with neither a superior nor a subordinate: " +
+                counted(lonely, "definition") + ".");
   }
 }
 

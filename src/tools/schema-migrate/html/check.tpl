@@ -45,12 +45,12 @@
 <form id="filters" role="search" aria-label="Filters" hidden>
 <label for="words">Name, OID or any text</label>
 <input id="words" type="search" autocomplete="off" spellcheck="false">
+<p id="shown" role="status"></p>
 {{#FACET}}<fieldset data-facet="{{FACET_NAME}}"><legend>{{HEADING}}</legend>
-{{#CHOICE}}<label><input type="checkbox" value="{{VALUE}}" checked> {{WORD}} <span class="number">{{NUMBER}}</span></label>{{/CHOICE}}
+{{#CHOICE}}<label><input type="checkbox" value="{{VALUE}}" checked> <span>{{WORD}}</span> <span class="number">{{NUMBER}}</span></label>{{/CHOICE}}
 </fieldset>{{/FACET}}
 <button type="reset">Show all</button>
 </form>
-<p id="shown" role="status"></p>
 </aside>
 <main id="main" tabindex="-1">
 {{#NOTHING}}<p>{{TEXT}}</p>{{/NOTHING}}

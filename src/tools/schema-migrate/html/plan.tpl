@@ -44,12 +44,12 @@
 <form id="filters" role="search" aria-label="Filters" hidden>
 <label for="words">Name, OID or any text</label>
 <input id="words" type="search" autocomplete="off" spellcheck="false">
+<p id="shown" role="status"></p>
 {{#FACET}}<fieldset data-facet="{{FACET_NAME}}"><legend>{{HEADING}}</legend>
-{{#CHOICE}}<label><input type="checkbox" value="{{VALUE}}" checked> {{WORD}} <span class="number">{{NUMBER}}</span></label>{{/CHOICE}}
+{{#CHOICE}}<label><input type="checkbox" value="{{VALUE}}" checked> <span>{{WORD}}</span> <span class="number">{{NUMBER}}</span></label>{{/CHOICE}}
 </fieldset>{{/FACET}}
 <button type="reset">Show all</button>
 </form>
-<p id="shown" role="status"></p>
 </aside>
 <main id="main" tabindex="-1">
 {{#SECTION}}
@@ -61,7 +61,7 @@
 <h3><span class="sign {{STYLE_CLASS}}" aria-hidden="true">{{SIGN}}</span>{{KIND_WORD}} <b>{{NAME}}</b> {{OID}}{{#EXTENDS}} {{#TO}}<a href="#d{{N}}">{{/TO}}of this attribute type{{#TO_END}}</a>{{/TO_END}}{{/EXTENDS}}</h3>
 <p class="what">{{CLASS_WORD}}{{#ALSO}}, {{WORD}}{{/ALSO}} → <b>{{OUTCOME}}</b>{{#RISKY}} <span class="risk {{RISK}}">{{RISK_SIGN}} risk: {{RISK}}</span>{{/RISKY}}</p>
 <p>{{#REASON}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/REASON}}</p>
-<table class="sides"><thead><tr><th scope="col">Clause</th>{{#SIDE}}<th scope="col">{{SIDE_NAME}} {{PLACE}}</th>{{/SIDE}}</tr></thead>
+<table class="sides{{#NO_BASE}} three{{/NO_BASE}}"><thead><tr><th scope="col">Clause</th>{{#SIDE}}<th scope="col">{{SIDE_NAME}} {{PLACE}}</th>{{/SIDE}}</tr></thead>
 <tbody>
 {{#CLAUSE}}<tr class="differs"><th scope="row">≠ {{CLAUSE_NAME}}{{#CLAUSE_RISK}} {{SIGN}} {{WORD}}{{/CLAUSE_RISK}}</th>{{#CELL}}<td{{#STYLED}} class="{{CELL_CLASS}}"{{/STYLED}}>{{#PART}}{{#ADDED}}<ins>{{/ADDED}}{{#LOST}}<del>{{/LOST}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{#LOST_END}}</del>{{/LOST_END}}{{#ADDED_END}}</ins>{{/ADDED_END}}{{/PART}}</td>{{/CELL}}</tr>{{/CLAUSE}}
 {{#ALIKE}}<tr><th scope="row">{{ALIKE_NAME}}</th><td colspan="{{WIDTH}}">{{#OTHER}}{{CLAUSE_NAME}} {{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}{{#OTHER_separator}} · {{/OTHER_separator}}{{/OTHER}}</td></tr>{{/ALIKE}}
@@ -98,7 +98,7 @@
 <section id="same" aria-labelledby="same-heading">
 <h2 id="same-heading">Unchanged <span class="number">{{NUMBER}}</span></h2>
 <p>Of these nothing changes: they are the same in OLD and NEW, or gone in both.</p>
-{{#DEFINITION}}<p class="item unchanged" id="d{{N}}" data-class="{{CLASS}}" data-risk="{{RISK}}" data-kind="{{KIND}}"><b>{{NAME}}</b> {{OID}} {{KIND_WORD}}, {{CLASS_WORD}}, {{OUTCOME}} <small>{{PLACE}}</small> {{#OTHER}}{{CLAUSE_NAME}} {{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}{{#OTHER_separator}} · {{/OTHER_separator}}{{/OTHER}}</p>
+{{#DEFINITION}}<p class="item unchanged" id="d{{N}}" data-class="{{CLASS}}" data-risk="{{RISK}}" data-kind="{{KIND}}"><b>{{NAME}}</b> {{OID}} {{KIND_WORD}}, {{CLASS_WORD}}, {{OUTCOME}}: {{WHY}} <small>{{PLACE}}</small> {{#OTHER}}{{CLAUSE_NAME}} {{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}{{#OTHER_separator}} · {{/OTHER_separator}}{{/OTHER}}</p>
 {{/DEFINITION}}
 </section>
 {{/SAME}}

@@ -49,13 +49,21 @@
       count === items.length ? "All " + count + " shown" : count + " of " + items.length + " shown";
   };
 
+  // What comes near to being seen gets its true height, and moves what is below it.
+  const scrollTo = (target, more) => {
+    target.scrollIntoView();
+    if (more > 0) {
+      requestAnimationFrame(() => scrollTo(target, more - 1));
+    }
+  };
+
   // A link leads to what a filter hides, too.
   const reveal = () => {
     const target = document.getElementById(location.hash.slice(1));
     if (target !== null && target.closest("[hidden]") !== null) {
       form.reset();
       apply();
-      target.scrollIntoView();
+      scrollTo(target, 5);
     }
   };
 
