@@ -55,8 +55,7 @@ std::vector<ClauseChoices> clausesOf(const Verdict& row) {
 }  // namespace
 
 Questionnaire::Questionnaire(const MigrationPlan& plan)
-    : m_plan(plan),
-      m_result(std::make_unique<ResultIndex>(plan.threeWay.differences, ResultIndex::Of::kAll)) {
+    : m_result(std::make_unique<ResultIndex>(plan.threeWay.differences, ResultIndex::Of::kAll)) {
   std::set<std::pair<Kind, std::string>> seen;
   for (const Verdict& row : plan.threeWay.differences) {
     if (row.isUndecided() && !goesWithAnUndecidedAttribute(row, plan)) {

@@ -56,7 +56,6 @@ class Questionnaire {
   Decision decisionAbout(const Verdict& difference) const;
 
  private:
-  const MigrationPlan& m_plan;
   std::vector<const Verdict*> m_open;
   std::unique_ptr<const ResultIndex> m_result;
   std::set<std::pair<Kind, std::string>> m_sharedOids;  // that are no name for one definition alone
