@@ -1,8 +1,13 @@
 // The decisions file of decide: what stood in it stays, whoever wrote it and whenever; and what a
 // terminal gets to see of hostile and of foreign text.
 
+#include <sys/resource.h>
+#include <unistd.h>
+
 #include <array>
 #include <filesystem>
+#include <string>
+#include <vector>
 
 #include "DecideRun.h"
 
@@ -164,6 +169,35 @@ TEST_F(Deciding, AFileThatCannotBeWrittenIsToldBeforeAnythingIsAsked) {
     EXPECT_NE(result.err.find(name), std::string::npos) << result.err;
     EXPECT_EQ(result.out, "");
   }
+}
+
+// As on a disk that gets full in the middle of an entry.
+TEST_F(Deciding, AnEntryThatCannotBeWrittenWholeIsNotThereAtAll) {
+  m_folder.write("d.toml", kMine);
+  std::vector<std::string> words = command();
+  words.insert(words.begin(), SCHEMA_MIGRATE);
+  TerminalRun run(m_folder, [&] {
+    const rlimit limit{sizeof kMine + 20, sizeof kMine + 20};
+    std::vector<char*> pointers;
+    for (std::string& word : words) {
+      pointers.push_back(word.data());
+    }
+    pointers.push_back(nullptr);
+    ::setrlimit(RLIMIT_FSIZE, &limit);
+    ::execv(SCHEMA_MIGRATE, pointers.data());
+    return 127;
+  });
+  run.until("Your choice: ");
+  run.type("n");
+  run.until("Reason (Enter for none): ");
+  run.type("");
+  const std::string text = wordsOnScreen(run.rest());
+  EXPECT_NE(text.find("d.toml: error: cannot be written: File too large; the last answer is not in "
+                      "it, those before it are"),
+            std::string::npos)
+      << text;
+  EXPECT_EQ(run.exitCode(), 5);
+  EXPECT_EQ(file(), kMine);
 }
 
 TEST_F(Deciding, TwoRunsDoNotAddToOneFileAtATime) {

@@ -95,7 +95,7 @@ class DecideCommand : public Command {
     }
     std::unique_ptr<migration::MigrationPlan> plan = m_options.makePlan();
     refuseMistaken(*plan);
-    if (plan->undecidedCount == 0) {
+    if (migration::Questionnaire(*plan).open().empty()) {
       console->print("Nothing is undecided.\n");
       return conclude(*plan, console);
     }

@@ -16,7 +16,6 @@ using migration::Decision;
 using migration::MigrationPlan;
 using migration::Question;
 using migration::Questionnaire;
-using migration::Take;
 using migration::Verdict;
 
 std::string outcomeOf(const MigrationPlan& plan, const std::string& place) {

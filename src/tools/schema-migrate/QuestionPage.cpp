@@ -208,6 +208,10 @@ std::string questionPage(const std::string& title, const Question& question,
           (row.risk == migration::Risk::kNone ? "" : " [" + std::string(wordOf(row.risk)) + "]") +
           ": " + wholePrintable(row.reason),
       style);
+  if (row.kind() == migration::Kind::kVendorExtension && row.match.attribute != migration::kNoRow) {
+    const Verdict& type = plan.threeWay.differences[row.match.attribute];
+    text += paragraph(2, "It belongs to " + wholePrintable(describe(type)) + ".", style);
+  }
   text += paragraph(2, wholePrintable(placesOf(row.match)), style) + "\n";
   text += row.clauses.empty() ? wholeSides(row.match, hasBase, style)
                               : clauseLines(row, hasBase, style);
