@@ -1,5 +1,6 @@
 #include "Target.h"
 
+#include <libschema-migration/Kept.h>
 #include <unistd.h>
 
 #include <cstdio>
@@ -9,7 +10,6 @@
 #include <iostream>
 #include <sstream>
 
-#include "EndlessInput.h"
 #include "ldtr.h"
 
 namespace fuzz {
@@ -84,8 +84,17 @@ std::string read(const std::string& path) {
   return text.str();
 }
 
-bool neverEnds(const std::string& text) {
-  return foreseeReading(text, nullptr).reading == Reading::kNeverEnds;
+namespace {
+
+migration::ReadingEnd endOf(const std::string& text) {
+  const migration::Source source("V3.user.at", text);
+  return migration::KeptFile(source).ending();
 }
+
+}  // namespace
+
+bool neverEnds(const std::string& text) { return endOf(text) == migration::ReadingEnd::kNeverEnds; }
+
+bool isReadWhole(const std::string& text) { return endOf(text) == migration::ReadingEnd::kWhole; }
 
 }  // namespace fuzz

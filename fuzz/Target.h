@@ -39,8 +39,11 @@ std::string read(const std::string& path);
 //   - COLLECTIVE where a clause of an attribute type begins;
 //   - a NAME clause that the end of the file is met in;
 //   - a DBNAME list that the end of the file is met in.
-// It is the forecast by which the migration tool refuses such files.
+// It is the guard by which the migration library refuses such files.
 bool neverEnds(const std::string& text);
+
+// Whether the library reads it without a failure.
+bool isReadWhole(const std::string& text);
 
 }  // namespace fuzz
 

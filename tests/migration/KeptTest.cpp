@@ -198,6 +198,91 @@ TEST(KeptEqualsTheManager, OnDamagedDefinitions) {
   }
 }
 
+// ---- Endings ----
+
+struct EndingCase {
+  const char* name;
+  const char* text;
+  ReadingEnd ending;
+};
+
+const EndingCase kEndings[] = {
+    {"EmptyFile", "", ReadingEnd::kWhole},
+    {"JunkOnly", "a ( b ) '", ReadingEnd::kWhole},
+    {"StringCutOffByALineEnd",
+     "attributetypes=( 1.1 DESC 'a\nb' OBSOLETE )\nattributetypes=( 1.2 )\n", ReadingEnd::kFails},
+    {"StringCutOffByAByteOf128",
+     "attributetypes {\n( 1.1 NAME 'gr\xC3\xB6n' OBSOLETE )\n( 1.2 NAME 'b' OBSOLETE )\n}\n",
+     ReadingEnd::kWhole},
+    {"StringCutOffBetweenDefinitions",
+     "it's one attributetypes=( 1.1 )\nit's another\nattributetypes=( 1.2 )\n'\n",
+     ReadingEnd::kWhole},
+    {"EachKind",
+     "attributetypes=( 1.1 NAME 'a' DESC 'd' )\nobjectclasses=( 1.2 NAME 'b' STRUCTURAL )\nORVAttributetypes=( 1.1 DBNAME ( 'a' ) )\n",
+     ReadingEnd::kWhole},
+    {"BlocksOfEachKind",
+     "attributetypes {\n( 1.1 NAME 'a' DESC 'd' )\n\n( 1.2 NAME 'b' OBSOLETE ) }\nobjectclasses { ( 1.3 MAY ( a ) )\n( 1.4 MUST ( a ) ) }\nORVAttributetypes {\n( 1.1 LENGTH 1 ) }\n",
+     ReadingEnd::kWhole},
+    {"CollectiveInAttributeType", "attributetypes=( 1.1 NAME 'a' COLLECTIVE )\n",
+     ReadingEnd::kWhole},
+    {"CollectiveInABlock", "attributetypes {\n( 1.1 NAME 'a' DESC 'd'\n  COLLECTIVE ) }\n",
+     ReadingEnd::kWhole},
+    {"CollectiveAsAValue", "attributetypes=( 1.1 NAME 'a' SUP COLLECTIVE )\n", ReadingEnd::kWhole},
+    {"CollectiveInQuotesInClausePosition", "attributetypes=( 1.1 'COLLECTIVE' )\n",
+     ReadingEnd::kWhole},
+    {"CollectiveBehindTheDefinition", "attributetypes=( 1.1 ) COLLECTIVE\n", ReadingEnd::kWhole},
+    {"CollectiveInOtherKinds",
+     "objectclasses=( 1.1 COLLECTIVE NAME 'a' MAY ( b ) )\nORVAttributetypes=( 1.1 COLLECTIVE )\n",
+     ReadingEnd::kWhole},
+    {"CollectiveBehindAFailure", "attributetypes=( 1.1\nattributetypes=( 1.2 COLLECTIVE )\n",
+     ReadingEnd::kWhole},
+    {"NamesOfAttributeTypeToTheEnd", "attributetypes=( 1.1 NAME 'a' )\n", ReadingEnd::kWhole},
+    {"FirstTokenOfAttributeNamesIsNotLookedAt", "attributetypes=( 1.1 NAME DESC )\n",
+     ReadingEnd::kWhole},
+    {"NamesThatSwallowADefinition",
+     "attributetypes=( 1.1 NAME 'a' )\nattributetypes=( 1.2 NAME 'b' DESC 'd' )\n",
+     ReadingEnd::kWhole},
+    {"NamesOfObjectClassToTheEnd", "objectclasses=( 1.1\n NAME 'a' )\n", ReadingEnd::kWhole},
+    {"FirstTokenOfClassNamesIsLookedAt", "objectclasses=( 1.1 NAME STRUCTURAL )\n",
+     ReadingEnd::kWhole},
+    {"SyntaxDoesNotEndTheNamesOfAClass", "objectclasses=( 1.1 NAME 'a' SYNTAX 1.2 )\n",
+     ReadingEnd::kWhole},
+    {"DatabaseNamesToTheEnd", "ORVAttributetypes=( 1.1 DBNAME ( 'a' 'b'\n", ReadingEnd::kWhole},
+    {"DatabaseNamesThenAnotherLine",
+     "ORVAttributetypes {\n( 1.1 DBNAME ( 'a' )\n( 1.2 DBNAME ( 'b' ) ) }\n", ReadingEnd::kWhole},
+    {"DatabaseNamesThenALineThatDoesNotCount",
+     "ORVAttributetypes {\n( 1.1 DBNAME ( a ) 'x\n( 1.2 DBNAME ( 'b' ) ) }\n", ReadingEnd::kWhole},
+    {"AttributeTypeNotClosed", "attributetypes=( 1.1 DESC 'd'\n", ReadingEnd::kWhole},
+    {"ObjectClassNotClosed", "objectclasses=( 1.1 DESC 'd'\n\nobjectclasses=( 1.2 )\n",
+     ReadingEnd::kWhole},
+    {"VendorExtensionNotClosed", "ORVAttributetypes=( 1.1 LENGTH 3\nattributetypes=( 1.2 )\n",
+     ReadingEnd::kWhole},
+    {"VendorExtensionThatSwallowsAnother",
+     "ORVAttributetypes=( 1.1 LENGTH 3\nORVAttributetypes=( 1.2 LENGTH 4 )\n", ReadingEnd::kWhole},
+    {"BlockNotClosed", "attributetypes {\n( 1.1 DESC 'd' )\n", ReadingEnd::kFails},
+    {"LengthOfNumberNotComplete", "objectclasses=( 1.1{x ABSTRACT )\n", ReadingEnd::kWhole},
+    {"NeitherFormOfDefinition", "attributetypes ( 1.1 )\n", ReadingEnd::kWhole},
+    {"KeywordAtTheEnd", "\nobjectClasses ", ReadingEnd::kWhole},
+    {"ClosingParenthesisIsTheLastByte", "attributetypes=( 1.1 )", ReadingEnd::kWhole},
+    {"ClosingParenthesisInPlaceOfAValue", "attributetypes=( 1.1 DESC ) )\n", ReadingEnd::kWhole},
+    {"UnknownWordReplacesOid", "attributetypes=( 1.1 NAME 'a' DESC 'd' X-ORIGIN 'site' )\n",
+     ReadingEnd::kWhole},
+    {"NumberInAList", "objectclasses=( 1.1 MUST ( 2.5.4.3 $ cn ) )\n", ReadingEnd::kWhole},
+};
+
+TEST(KeptEnding, IsThatOfTheManager) {
+  for (const EndingCase& row : kEndings) {
+    SCOPED_TRACE(row.name);
+    const Source source(kFile, row.text);
+    EXPECT_EQ(row.ending, KeptFile(source).ending());
+    if (row.ending == ReadingEnd::kNeverEnds) {
+      EXPECT_TRUE(managerNeverEnds(row.text));
+    } else {
+      EXPECT_EQ(managersReading(row.text), keptReading(KeptFile(source)));
+    }
+  }
+}
+
 // ---- Places ----
 
 std::string placesIn(const std::string& text) {

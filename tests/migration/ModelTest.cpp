@@ -148,8 +148,8 @@ TEST_F(Directory, LimitIsOfAllFilesTogether) {
   write("V3.user.oc", "# 45\n");
   EXPECT_EQ("V3.system.at 5\nV3.user.at 7\nV3.user.oc 5\n", read(17));
   EXPECT_EQ(
-      "V3.system.at 5\nV3.user.oc 5\n/V3.user.at: cannot be read: it is larger than the limit of 6 "
-      "bytes\n",
+      "V3.system.at 5\nV3.user.oc 5\n/V3.user.at: with this file the inputs have more than 11 bytes "
+      "in all\n",
       read(11));
 }
 
@@ -183,7 +183,7 @@ TEST(Texts, LimitIsOfAllTogether) {
       "d", {{"V3.user.oc", "# 3\n"}, {"V3.user.at", "# 34567\n"}}, limits, &failures);
   EXPECT_EQ(1U, schema.files().size());
   EXPECT_TRUE(schema.hasFile("V3.user.oc"));
-  EXPECT_EQ("d/V3.user.oc: cannot be read: it is larger than the limit of 1 bytes\n",
+  EXPECT_EQ("d/V3.user.oc: with this file the inputs have more than 9 bytes in all\n",
             textOf(failures));
 }
 

@@ -101,5 +101,5 @@ expect "differences" "< vendor extension 1.1
 < object class visitor (1.9)
 > attribute type name (1.2)" "$(build/differences old new)"
 expect "memory" "upload/V3.user.at:1:39: R401
-upload/V3.user.oc: cannot be read: it is larger than the limit of 155 bytes" "$(build/memory)"
+upload/V3.user.oc: with this file the inputs have more than 200 bytes in all" "$(build/memory)"
 expect "the directories afterwards" "$before" "$(cat old/* new/* | cksum)"

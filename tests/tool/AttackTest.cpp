@@ -87,8 +87,8 @@ class Attack : public testing::Test {
         ASSERT_EQ(0, ::chdir(folder.file("p").c_str()));
         const Attacker attacker(act);
         ASSERT_EQ(0, ::chdir("/"));
-        result = folder.run({"migrate", "--from", "@/old", "--to", "@/new", "--out", "@/p/out",
-                             "--allow-foreign-parent"},
+        result = folder.run({"migrate", "--from", "@/old", "--to", "@/new", "--layout", "library",
+                             "--out", "@/p/out", "--allow-foreign-parent"},
                             [] { ::alarm(30); });
       }
       EXPECT_TRUE(result.exitCode == 0 || result.exitCode == 5) << result.exitCode;

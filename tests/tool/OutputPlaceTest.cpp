@@ -24,8 +24,8 @@ class OutputPlaceOf : public testing::Test {
   }
 
   ToolResult runTo(const std::string& out, const std::vector<std::string>& more = {}) const {
-    std::vector<std::string> arguments = {"migrate", "--from", "@/old", "--to",
-                                          "@/new",   "--out",  out};
+    std::vector<std::string> arguments = {"migrate",  "--from",  "@/old", "--to", "@/new",
+                                          "--layout", "library", "--out", out};
     arguments.insert(arguments.end(), more.begin(), more.end());
     return folder.run(arguments);
   }

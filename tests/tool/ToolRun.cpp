@@ -152,8 +152,8 @@ ToolResult ToolFolder::run(const std::vector<std::string>& arguments,
 
 ToolResult ToolFolder::migrate(const std::vector<std::string>& more,
                                const std::function<void()>& prepare) const {
-  std::vector<std::string> arguments = {"migrate", "--from", "@/old", "--to",
-                                        "@/new",   "--out",  "@/out"};
+  std::vector<std::string> arguments = {"migrate", "--from", "@/old",    "--to",   "@/new",
+                                        "--out",   "@/out",  "--layout", "library"};
   arguments.insert(arguments.end(), more.begin(), more.end());
   return run(arguments, prepare);
 }
@@ -165,7 +165,8 @@ std::string ToolFolder::captured(const std::string& stream, std::string out) con
 
 pid_t ToolFolder::startMigrate(const std::string& old, const std::string& out,
                                const std::function<void()>& prepare) const {
-  return start({"migrate", "--from", "@/" + old, "--to", "@/new", "--out", "@/" + out},
+  return start({"migrate", "--from", "@/" + old, "--to", "@/new", "--out", "@/" + out, "--layout",
+                "library"},
                captured("out", out), captured("err", out), prepare);
 }
 

@@ -42,7 +42,8 @@ class ToolFolder {
   ToolResult run(const std::vector<std::string>& arguments,
                  const std::function<void()>& prepare = nullptr) const;
 
-  // "migrate --from @/old --to @/new --out @/out" and more.
+  // "migrate --from @/old --to @/new --out @/out --layout library" and more. Of the two layouts it
+  // is the one with the most files.
   ToolResult migrate(const std::vector<std::string>& more = {},
                      const std::function<void()>& prepare = nullptr) const;
 

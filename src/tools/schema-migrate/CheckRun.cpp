@@ -83,7 +83,7 @@ class CheckRun {
   }
 
   std::unique_ptr<Source> readFile(const std::string& path) {
-    return migration::readSource(path, kMaxFileBytes, &m_report.failures);
+    return migration::readSource(path, migration::ReadLimits(), &m_report.failures);
   }
 
   void readLists() {
@@ -199,8 +199,6 @@ class CheckRun {
     return errors != 0 || (m_options.doWarningsFail && !m_report.findings.empty()) ? kFindings
                                                                                    : kDone;
   }
-
-  static constexpr std::uint64_t kMaxFileBytes = std::uint64_t{1} << 30;
 
   const CheckOptions& m_options;
   CheckReport m_report;

@@ -38,13 +38,6 @@ std::string placeOf(const std::string& path, const Position& position) {
 
 std::string systemError(int errorNumber) { return std::strerror(errorNumber); }
 
-std::string orList(const std::string& oid, const std::string& purpose) {
-  if (oid.empty() || oid.find_first_of(" \t\n\v\f\r#") != std::string::npos) {
-    return "";
-  }
-  return ", or list " + printable(oid) + " in a file for --exclude-oids " + purpose;
-}
-
 std::string counted(std::uint64_t count, const std::string& noun) {
   return std::to_string(count) + " " + noun + (count == 1 ? "" : "s");
 }

@@ -49,10 +49,6 @@ std::string placeOf(const std::string& path, const Position& position);
 // The text that goes with `errorNumber`, as in "No such file or directory".
 std::string systemError(int errorNumber);
 
-// ", or list OID in a file for --exclude-oids PURPOSE"; nothing for an OID that no list can hold:
-// none, or one with white space or "#" in it.
-std::string orList(const std::string& oid, const std::string& purpose);
-
 // "1 definition", "2 definitions".
 std::string counted(std::uint64_t count, const std::string& noun);
 

@@ -1,122 +1,155 @@
 #include "MigrateRun.h"
 
+#include <libschema-migration/Execution.h>
 #include <sys/stat.h>
 
-#include "Inputs.h"
+#include <optional>
+#include <utility>
+#include <vector>
+
 #include "Interruption.h"
-#include "Inventory.h"
 #include "Messages.h"
-#include "Migration.h"
-#include "OidList.h"
+#include "MigrateSummary.h"
 #include "OutputDirectory.h"
-#include "Plan.h"
+#include "PlanReport.h"
 #include "PrivatePlace.h"
-#include "Report.h"
+#include "Progress.h"
 #include "RunPlaces.h"
-#include "SeparateProcess.h"
-#include "Verification.h"
+#include "Terminal.h"
+#include "TextOutput.h"
 
 namespace {
 
-void refuseIfNeeded(const Plan& plan) {
-  if (plan.refusalCount() != 0) {
-    throw Failure(kRefused, plan.refusals() +
-                                errorLine("refused: " + counted(plan.refusalCount(), "definition") +
-                                          " cannot be migrated; nothing was written"));
+using migration::Execution;
+using migration::MigrationPlan;
+using migration::NamedText;
+
+OutputOptions outputOptions(const PlanOptions& planOptions, const MigrateOptions& options) {
+  const mode_t mask = ::umask(0);
+  ::umask(mask);
+  std::vector<std::string> inputs = {planOptions.request.old, planOptions.request.latest};
+  if (!planOptions.request.base.empty()) {
+    inputs.push_back(planOptions.request.base);
+  }
+  return {options.out, inputs, options.allowForeignParent, mask};
+}
+
+void report(const MigrationPlan& plan, const MigrateOptions& options, Console* console) {
+  DifferenceFilter filter;
+  filter.isWithSame = options.isJson;
+  const ShownDifferences shown = shownOf(plan, filter);
+  if (options.isJson) {
+    console->print(renderPlanJson(plan, shown, "migrate"));
+  } else {
+    console->printText(renderDifferences(plan, shown, {isColourWanted(), false}) +
+                       renderFindings(plan));
   }
 }
 
-// What a run reads, opened and copied.
-struct Opened {
-  Inputs inputs;
-  std::vector<const ListFile*> excludeLists;
-  const ListFile* withdrawList = nullptr;
-  const Installation* oldOne = nullptr;
-  const Installation* newOne = nullptr;
-
-  Opened(const MigrateOptions& options, std::string* warnings) : inputs(options.maxInput) {
-    for (const std::string& path : options.excludeLists) {
-      excludeLists.push_back(&inputs.openList(path));
-    }
-    if (!options.withdrawList.empty()) {
-      withdrawList = &inputs.openList(options.withdrawList);
-    }
-    oldOne = &inputs.openInstallation("OLD", options.from, warnings);
-    newOne = &inputs.openInstallation("NEW", options.to, warnings);
+void refuseUnlessReady(const MigrationPlan& plan) {
+  if (!plan.isReady()) {
+    const char* const advice =
+        plan.undecidedCount == 0
+            ? "refused: nothing was written"
+            : "refused: nothing was written; plan --template makes a file in which what is undecided "
+              "can be decided";
+    throw Failure(kRefused, whyNotReady(plan) + errorLine(advice));
   }
+}
 
-  OidLists readLists() const {
-    OidLists lists;
-    for (const ListFile* const list : excludeLists) {
-      readOidList(*list, &lists.excluded);
-    }
-    if (withdrawList != nullptr) {
-      readOidList(*withdrawList, &lists.withdrawn);
-    }
-    return lists;
+std::string linesOf(const migration::Failures& failures) {
+  std::string lines;
+  for (const migration::Failure& failure : failures) {
+    lines += failure.line == 0
+                 ? errorLine(failure.file, failure.text)
+                 : errorLine(placeOf(failure.file, {failure.line, failure.column}), failure.text);
   }
-};
+  return lines;
+}
 
-void copyAll(const OwnDirectory& written, const Installation& newOne, OutputDirectory* output) {
-  for (std::size_t file = 0; file < kWrittenFiles; ++file) {
-    output->copyIn(written.directory(), kSchemaFiles[file]);
+// The result in the layout that is wanted, as the library came to it.
+std::vector<NamedText> execute(const MigrationPlan& plan, bool isInLibraryLayout,
+                               PrivatePlace* place) {
+  for (const char* const folder : migration::kExecutionFolders) {
+    place->makeDirectory(folder);
   }
-  for (std::size_t file = kWrittenFiles; file < kSchemaFiles.size(); ++file) {
-    if (newOne.files[file].isThere) {
-      output->copyIn(*newOne.copies, kSchemaFiles[file], newOne.files[file].mode);
-    }
+  progress::step("carrying the plan out");
+  Execution execution = migration::execute(plan.request, plan.threeWay, place->path());
+  if (!execution.failures.empty() && execution.departsFromPlan) {
+    throw Failure(kRefused, linesOf(execution.failures) +
+                                errorLine("refused: the server's library does not come to what was "
+                                          "planned; nothing was written"));
+  }
+  if (!execution.failures.empty()) {
+    throw Failure(kNotWritten, linesOf(execution.failures));
+  }
+  if (!isInLibraryLayout) {
+    return std::move(execution.inNewsLayout);
+  }
+  if (!execution.notCarriedByLibrary.empty()) {
+    throw Failure(kRefused,
+                  linesOf(execution.notCarriedByLibrary) +
+                      errorLine("refused: the library does not write these as they are; without "
+                                "--layout library they stay"));
+  }
+  return std::move(execution.inLibraryLayout);
+}
+
+// A config file has the mode that NEW's has; the others get that of any new file.
+std::vector<OutputText> outputTexts(const MigrationPlan& plan, std::vector<NamedText> texts) {
+  std::vector<OutputText> outputs;
+  outputs.reserve(texts.size());
+  for (NamedText& text : texts) {
+    const migration::SchemaFile* const file = plan.latest->file(text.name);
+    const bool isConfigFile = text.name.rfind("V3.config.", 0) == 0;
+    const bool isCopied = isConfigFile && file != nullptr;
+    outputs.push_back({std::move(text.name), std::move(text.bytes),
+                       isCopied ? std::optional<mode_t>(file->mode) : std::nullopt});
+  }
+  return outputs;
+}
+
+void summarize(const MigrateOptions& options, const std::string& summary, Console* console) {
+  if (!options.isJson && !console->write(summary)) {
+    throw Failure(
+        kNotWritten,
+        options.isDryRun
+            ? errorLine("the summary cannot be written to standard output")
+            : errorLine(
+                  options.out,
+                  "is complete and in place, but the summary cannot be written to standard output"));
   }
 }
 
 }  // namespace
 
-// The private copies are read three times: to work the run out, for the collision reports, and for
-// the run. What one does not need any more it gives back before the next begins; the check for
-// collisions cannot, since it empties tables without deleting what was in them.
-void migrate(const MigrateOptions& options, Console* console) {
-  const mode_t mask = ::umask(0);
-  ::umask(mask);
+void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Console* console) {
   Removals* const removals = interruption::removals();
   std::string warnings;
-  OutputDirectory output(
-      {options.out, {options.from, options.to}, options.allowForeignParent, mask}, removals,
-      &warnings);
+  OutputDirectory output(outputOptions(planOptions, options), removals, &warnings);
   console->complain(&warnings);
-  Opened opened(options, &warnings);
-  PrivatePlace place(privatePlaceFor(options.out, opened.inputs.size()), removals, &warnings);
+  const std::unique_ptr<MigrationPlan> plan = planOptions.makePlan();
+  warnings = warningsOf(*plan);
   console->complain(&warnings);
-  opened.inputs.copyTo(&place);
-  const OidLists lists = opened.readLists();
-  Inventory oldOne(*opened.oldOne, &warnings);
-  Inventory newOne(*opened.newOne, &warnings);
-  console->complain(&warnings);
-  Plan plan(oldOne, newOne, lists);
-  oldOne.releaseObjects();
-  newOne.releaseObjects();
-  refuseIfNeeded(plan);
-  warnings = plan.warnings();
-  console->complain(&warnings);
-
-  const Installations installations{oldOne, newOne, opened.excludeLists, opened.withdrawList};
-  console->print(textFromSeparateProcess([&] { return reportCollisions(installations); }));
-  const OwnDirectory& written = place.makeDirectory("written");
+  report(*plan, options, console);
+  refuseUnlessReady(*plan);
+  std::string summary;
   {
-    Migration migration(installations);
-    migration.write(place.pathOf("written"));
+    PrivatePlace place(privatePlaceFor(options.out, plan->old->size() + plan->latest->size()),
+                       removals, &warnings);
+    console->complain(&warnings);
+    std::vector<NamedText> texts = execute(*plan, options.isInLibraryLayout, &place);
+    summary = "\n" + summaryOf(*plan, texts, options.isInLibraryLayout);
+    progress::step("writing and verifying");
+    writeTexts(outputTexts(*plan, std::move(texts)), &output);
   }
-  verifyWritten(written.directory(), place.pathOf("written"), plan);
-  output.create();
-  copyAll(written, *opened.newOne, &output);
-  output.sync();
-  verifyOutput(output.directory(), written.directory(), plan, newOne);
-  const std::string summary = "\n" + summaryOf(oldOne, newOne, &plan) +
-                              "Written and verified: " + wholePrintable(options.out) + "\n";
+  const std::string shownOut = wholePrintable(options.out);
+  if (options.isDryRun) {
+    summarize(options,
+              summary + "Verified, but not written, as this was a dry run: " + shownOut + "\n",
+              console);
+    return;
+  }
   output.publish();
-  if (!console->write(summary)) {
-    throw Failure(
-        kNotWritten,
-        errorLine(
-            options.out,
-            "is complete and in place, but the summary cannot be written to standard output"));
-  }
+  summarize(options, summary + "Written and verified: " + shownOut + "\n", console);
 }

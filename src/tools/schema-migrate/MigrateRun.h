@@ -3,23 +3,20 @@
 #ifndef SCHEMA_MIGRATE_MIGRATE_RUN_H
 #define SCHEMA_MIGRATE_MIGRATE_RUN_H
 
-#include <cstdint>
 #include <string>
-#include <vector>
 
 #include "Console.h"
+#include "PlanOptions.h"
 
 struct MigrateOptions {
-  std::string from;
-  std::string to;
-  std::string out;
-  std::vector<std::string> excludeLists;
-  std::string withdrawList;  // empty when there is none
-  std::uint64_t maxInput = std::uint64_t{1} << 30;
+  std::string out;  // the directory to create
   bool allowForeignParent = false;
+  bool isInLibraryLayout = false;  // as the library writes, not in NEW's own layout
+  bool isDryRun = false;           // everything but the publishing
+  bool isJson = false;
 };
 
 // Puts the migrated schema in place, whole and verified, or throws a Failure.
-void migrate(const MigrateOptions& options, Console* console);
+void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Console* console);
 
 #endif  // SCHEMA_MIGRATE_MIGRATE_RUN_H

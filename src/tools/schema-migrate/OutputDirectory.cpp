@@ -4,11 +4,9 @@
 #include <unistd.h>
 
 #include <cerrno>
-#include <cstddef>
 #include <cstdio>
 #include <utility>
 
-#include "InputFile.h"
 #include "Messages.h"
 
 namespace {
@@ -38,30 +36,26 @@ void OutputDirectory::create() {
   m_own.setPlace(m_place.name());
 }
 
-void OutputDirectory::copyIn(const Directory& source, const std::string& name,
-                             std::optional<mode_t> mode) {
-  const std::string path = directory().pathOf(name);
-  InputFile input(source, name);
-  Descriptor output = m_own.createFile(name, mode ? 0600 : 0666);
-  if (!output.isOpen()) {
+void OutputDirectory::write(const OutputText& text) {
+  const std::string path = directory().pathOf(text.name);
+  Descriptor file = m_own.createFile(text.name, text.mode ? 0600 : 0666);
+  if (!file.isOpen()) {
     failSystem(path, "cannot be created");
   }
-  std::vector<char> buffer(std::size_t{1} << 16);
-  while (const std::size_t count = input.read(buffer.data(), buffer.size())) {
-    if (!writeAll(output.number(), {buffer.data(), count})) {
-      failSystem(path, "cannot be written");
-    }
+  if (!writeAll(file.number(), text.bytes)) {
+    failSystem(path, "cannot be written");
   }
-  if (!input.problem().empty()) {
-    fail(source.pathOf(name), "cannot be read: " + input.problem());
-  }
-  if (mode && ::fchmod(output.number(), *mode) != 0) {
+  if (text.mode && ::fchmod(file.number(), *text.mode) != 0) {
     failSystem(path, "its mode cannot be set");
   }
-  m_files.push_back({name, std::move(output)});
+  m_files.push_back({text.name, std::move(file)});
 }
 
+// All are on their way before the first is waited for, so that they go to the disk together.
 void OutputDirectory::sync() {
+  for (const Written& written : m_files) {
+    static_cast<void>(::sync_file_range(written.file.number(), 0, 0, SYNC_FILE_RANGE_WRITE));
+  }
   for (const Written& written : m_files) {
     if (::fsync(written.file.number()) != 0) {
       failSystem(directory().pathOf(written.name), "cannot be brought to the disk");

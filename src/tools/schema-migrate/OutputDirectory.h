@@ -13,6 +13,12 @@
 #include "OwnDirectory.h"
 #include "Removals.h"
 
+struct OutputText {
+  std::string name;
+  std::string bytes;
+  std::optional<mode_t> mode;  // that of any new file without
+};
+
 class OutputDirectory {
  public:
   // Nothing is created yet; see OutputPlace.
@@ -25,10 +31,8 @@ class OutputDirectory {
 
   const Directory& directory() const { return m_own.directory(); }
 
-  // Creates a file in it with the bytes of the file of the same name in `source`, and with `mode`,
-  // or that of any new file.
-  void copyIn(const Directory& source, const std::string& name,
-              std::optional<mode_t> mode = std::nullopt);
+  // Creates a file in it.
+  void write(const OutputText& text);
 
   // Brings every file in it to the disk, and out of the memory that reading back would come from.
   void sync();

@@ -25,7 +25,9 @@ std::unique_ptr<migration::Source> readPlanFile(const std::string& path,
                                                 migration::Failures* failures) {
   // A plan tells of every definition more than the definition says.
   constexpr std::uint64_t kMost = std::uint64_t{1} << 33;
-  return migration::readSource(path, kMost, failures);
+  migration::ReadLimits limits;
+  limits.bytes = kMost;
+  return migration::readSource(path, limits, failures);
 }
 
 }  // namespace

@@ -1,12 +1,52 @@
 #include "PlanOptions.h"
 
+#include <cctype>
+#include <charconv>
+#include <cstddef>
 #include <filesystem>
+#include <limits>
+#include <string_view>
+#include <system_error>
 
 #include "CommandLine.h"
 #include "Messages.h"
 #include "Progress.h"
 
-#include <string_view>
+namespace {
+
+// Bytes; K, M and G stand for 1024 of what comes before. Returns 0 for what is no size.
+std::uint64_t bytesOf(const std::string& text) {
+  constexpr std::string_view kUnits = "KMG";
+  const char* const end = text.data() + text.size();
+  std::uint64_t bytes = 0;
+  const std::from_chars_result read = std::from_chars(text.data(), end, bytes);
+  if (read.ec != std::errc() || end - read.ptr > 1) {
+    return 0;
+  }
+  std::size_t unit = 0;
+  if (read.ptr != end) {
+    unit = kUnits.find(static_cast<char>(std::toupper(static_cast<unsigned char>(*read.ptr)))) + 1;
+    if (unit == 0) {
+      return 0;
+    }
+  }
+  const std::uint64_t factor = std::uint64_t{1} << (10 * unit);
+  return bytes > std::numeric_limits<std::uint64_t>::max() / factor ? 0 : bytes * factor;
+}
+
+const CLI::Validator kSize(
+    [](std::string& value) {
+      const std::uint64_t bytes = bytesOf(value);
+      if (bytes == 0) {
+        return "\"" + printable(value) +
+               "\" is no size; write a number of bytes, or one with K, M or G behind it, as in 500M";
+      }
+      value = std::to_string(bytes);
+      return std::string();
+    },
+    "", "size");
+
+}  // namespace
 
 void PlanOptions::declareInputs(CLI::App* command) {
   command->add_option("--from", request.old, "directory with the old installation's V3.* files")
@@ -24,6 +64,13 @@ void PlanOptions::declareInputs(CLI::App* command) {
       ->type_name("BASE");
   command->add_flag("--accept-base", request.acceptBase,
                     "BASE may equal OLD or NEW, as that of an installation never customised does");
+  command
+      ->add_option(
+          "--max-input", request.limits.bytes,
+          "refuse inputs of more than SIZE bytes in all, as in 500M or 2G; 1G unless given")
+      ->transform(kSize)
+      ->type_name("SIZE");
+  request.limits.advice = "if they are meant to, allow more with --max-input";
 }
 
 void PlanOptions::declareDecisions(CLI::App* command) {
@@ -41,10 +88,6 @@ void PlanOptions::declareDecisions(CLI::App* command) {
       ->add_option("--prefer", m_prefer, "decide clauses that were changed in two ways: old or new")
       ->check(oneOf({"old", "new"}))
       ->type_name("SIDE");
-}
-
-bool PlanOptions::hasBaseOrDecisions() const {
-  return !request.base.empty() || !request.decisions.empty() || !m_prefer.empty();
 }
 
 void PlanOptions::makePathsAbsolute() {
@@ -123,9 +166,10 @@ std::unique_ptr<migration::MigrationPlan> PlanOptions::makePlan() const {
   if (!plan->failures.empty()) {
     std::string lines;
     for (const migration::Failure& failure : plan->failures) {
-      lines += failure.line == 0
-                   ? errorLine(failure.file, failure.text)
-                   : errorLine(placeOf(failure.file, {failure.line, failure.column}), failure.text);
+      const std::string rule = failure.rule.empty() ? "" : " [" + failure.rule + "]";
+      lines += errorLine(
+          failure.line == 0 ? failure.file : placeOf(failure.file, {failure.line, failure.column}),
+          failure.text + rule);
     }
     throw Failure(kBadInput, lines);
   }

@@ -16,8 +16,6 @@ class PlanOptions {
   void declareInputs(CLI::App* command);
   void declareDecisions(CLI::App* command);
 
-  bool hasBaseOrDecisions() const;
-
   // So that what outlives the run, a saved plan or a record, can be used from any directory.
   void makePathsAbsolute();
 

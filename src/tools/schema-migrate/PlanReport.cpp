@@ -5,6 +5,8 @@
 
 #include <algorithm>
 #include <map>
+#include <string_view>
+#include <tuple>
 
 #include "Messages.h"
 
@@ -169,12 +171,28 @@ std::string countsOf(const ShownDifferences& shown, Word word) {
   return text;
 }
 
+// Of a failure, or a finding.
+template <typename Told>
+std::string placeTold(const Told& told) {
+  return told.line == 0 ? told.file : placeOf(told.file, {told.line, told.column});
+}
+
+template <typename Told>
+std::string textTold(const Told& told) {
+  return told.rule.empty() ? told.text : told.text + " [" + told.rule + "]";
+}
+
+// Whether the plan is refused for it.
+bool isRefused(const MigrationPlan& plan, const migration::Finding& finding) {
+  return std::any_of(plan.refusals.begin(), plan.refusals.end(),
+                     [&](const migration::Failure& refusal) {
+                       return std::tie(refusal.rule, refusal.file, refusal.line, refusal.column) ==
+                              std::tie(finding.rule, finding.file, finding.line, finding.column);
+                     });
+}
+
 std::string lineOf(const migration::Failure& failure) {
-  const std::string rule = failure.rule.empty() ? "" : " [" + failure.rule + "]";
-  if (failure.line == 0) {
-    return errorLine(failure.file, failure.text + rule);
-  }
-  return errorLine(placeOf(failure.file, {failure.line, failure.column}), failure.text + rule);
+  return errorLine(placeTold(failure), textTold(failure));
 }
 
 }  // namespace
@@ -207,6 +225,31 @@ std::string renderDifferences(const MigrationPlan& plan, const ShownDifferences&
     writer.addText(countsOf(shown, [](const Verdict& row) { return wordOf(row.outcome); }));
   }
   return writer.take();
+}
+
+std::string renderFindings(const MigrationPlan& plan) {
+  std::string lines;
+  for (const migration::Finding& finding : plan.ofInputs) {
+    lines += finding.severity == migration::Severity::kError
+                 ? errorLine(placeTold(finding), textTold(finding))
+                 : warningLine(placeTold(finding), textTold(finding));
+  }
+  return lines.empty() ? "" : "\nWhat check says of the inputs:\n" + lines;
+}
+
+std::string warningsOf(const MigrationPlan& plan) {
+  std::string lines;
+  for (const migration::Finding& finding : plan.ofInputs) {
+    const char family = finding.rule.front();
+    const bool isUnread = finding.rule == "I702" || finding.rule == "I703";
+    const bool isLost = (family == 'T' || family == 'O') &&
+                        finding.severity == migration::Severity::kError &&
+                        !isRefused(plan, finding);
+    if (isUnread || isLost) {
+      lines += warningLine(placeTold(finding), textTold(finding));
+    }
+  }
+  return lines;
 }
 
 std::string whyNotReady(const MigrationPlan& plan) {

@@ -3,25 +3,12 @@
 #include <sys/stat.h>
 
 #include <optional>
+#include <utility>
 #include <vector>
 
 #include "Interruption.h"
 #include "OutputDirectory.h"
-#include "PrivatePlace.h"
-#include "RunPlaces.h"
 #include "TextOutput.h"
-
-namespace {
-
-std::uint64_t sizeOf(const std::vector<migration::NamedText>& files) {
-  std::uint64_t size = 0;
-  for (const migration::NamedText& file : files) {
-    size += file.bytes.size();
-  }
-  return size;
-}
-
-}  // namespace
 
 CheckReport repairDirectory(const CheckOptions& options, const RepairOptions& repairOptions,
                             Console* console) {
@@ -38,14 +25,16 @@ CheckReport repairDirectory(const CheckOptions& options, const RepairOptions& re
     console->complain(&warnings);
     return report;
   }
-  PrivatePlace place(privatePlaceFor(repairOptions.out, sizeOf(files)), removals, &warnings);
   console->complain(&warnings);
-  const auto modeOf = [&](const std::string& name) {
+  std::vector<OutputText> texts;
+  texts.reserve(files.size());
+  for (migration::NamedText& file : files) {
     struct stat status {};
-    return ::stat((directory + "/" + name).c_str(), &status) == 0
-               ? std::optional<mode_t>(status.st_mode & 07777)
-               : std::nullopt;
-  };
-  publishTexts(files, modeOf, &place, &output);
+    const bool isThere = ::stat((directory + "/" + file.name).c_str(), &status) == 0;
+    texts.push_back({std::move(file.name), std::move(file.bytes),
+                     isThere ? std::optional<mode_t>(status.st_mode & 07777) : std::nullopt});
+  }
+  writeTexts(texts, &output);
+  output.publish();
   return report;
 }

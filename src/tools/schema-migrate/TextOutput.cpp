@@ -1,70 +1,99 @@
 #include "TextOutput.h"
 
+#include <fcntl.h>
+#include <unistd.h>
+
 #include <algorithm>
 #include <cerrno>
-#include <cstddef>
+#include <string_view>
 
-#include "Descriptor.h"
-#include "InputFile.h"
 #include "Messages.h"
 
 namespace {
 
-using migration::NamedText;
-
-void writeTo(const OwnDirectory& directory, const std::vector<NamedText>& texts) {
-  for (const NamedText& text : texts) {
-    const Descriptor file = directory.createFile(text.name, 0600);
-    if (!file.isOpen() || !writeAll(file.number(), text.bytes)) {
-      throw Failure(kNotWritten, errorLine(directory.directory().pathOf(text.name),
-                                           "cannot be written: " + systemError(errno)));
-    }
-  }
+[[noreturn]] void fail(const std::string& path, const std::string& text) {
+  throw Failure(kNotWritten, errorLine(path, text));
 }
 
-std::string readBack(const Directory& directory, const std::string& name) {
-  InputFile file(directory, name);
-  std::string bytes;
+// How far a file is what it has to be.
+struct Comparison {
+  std::size_t same = 0;    // bytes at its beginning
+  bool isAtItsEnd = true;  // it ends there
+  int error = 0;           // when it cannot be read
+};
+
+Comparison compare(const Directory& directory, const OutputText& wanted) {
+  constexpr int kFlags = O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC;
+  const Descriptor file(::openat(directory.number(), wanted.name.c_str(), kFlags));
+  Comparison result;
+  if (!file.isOpen()) {
+    result.error = errno;
+    return result;
+  }
   std::vector<char> buffer(std::size_t{1} << 16);
-  while (const std::size_t count = file.read(buffer.data(), buffer.size())) {
-    bytes.append(buffer.data(), count);
-  }
-  if (!file.problem().empty()) {
-    throw Failure(kNotWritten,
-                  errorLine(directory.pathOf(name), "cannot be read back: " + file.problem()));
-  }
-  return bytes;
-}
-
-// What stands in the output is the result, byte for byte, and nothing else.
-void verify(const Directory& directory, const std::vector<NamedText>& texts) {
-  std::vector<std::string> names;
-  std::vector<std::string> wanted;
-  for (const NamedText& text : texts) {
-    wanted.push_back(text.name);
-    if (readBack(directory, text.name) != text.bytes) {
-      throw Failure(kNotWritten,
-                    errorLine(directory.pathOf(text.name), "does not hold what was written to it"));
+  for (;;) {
+    const ssize_t count = ::read(file.number(), buffer.data(), buffer.size());
+    if (count < 0 && errno == EINTR) {
+      continue;
+    }
+    if (count <= 0) {
+      result.error = count < 0 ? errno : 0;
+      return result;
+    }
+    const std::string_view found(buffer.data(), static_cast<std::size_t>(count));
+    const std::string_view rest = std::string_view(wanted.bytes).substr(result.same);
+    const auto common = static_cast<std::ptrdiff_t>(std::min(found.size(), rest.size()));
+    const auto end = std::mismatch(found.begin(), found.begin() + common, rest.begin()).first;
+    result.same += static_cast<std::size_t>(end - found.begin());
+    if (end != found.end()) {
+      result.isAtItsEnd = false;
+      return result;
     }
   }
-  std::sort(wanted.begin(), wanted.end());
-  if (!directory.list(&names) || names != wanted) {
-    throw Failure(kNotWritten,
-                  errorLine(directory.path(), "holds other files than those that were written"));
+}
+
+void verify(const Directory& directory, const OutputText& wanted) {
+  const std::string path = directory.pathOf(wanted.name);
+  const Comparison result = compare(directory, wanted);
+  if (result.error != 0) {
+    fail(path, "cannot be read back: " + systemError(result.error));
+  }
+  if (!result.isAtItsEnd) {
+    const auto end = wanted.bytes.begin() + static_cast<std::ptrdiff_t>(result.same);
+    const auto line = 1 + std::count(wanted.bytes.begin(), end, '\n');
+    fail(placeOf(path, static_cast<std::uint64_t>(line)),
+         "does not hold what was written; is the disk in order?");
+  }
+  if (result.same != wanted.bytes.size()) {
+    fail(path, "was not written completely: it has " + std::to_string(result.same) + " of " +
+                   counted(wanted.bytes.size(), "byte") +
+                   "; is there space left on the file system?");
   }
 }
 
 }  // namespace
 
-void publishTexts(const std::vector<NamedText>& texts, const ModeOf& modeOf, PrivatePlace* place,
-                  OutputDirectory* output) {
-  const OwnDirectory& result = place->makeDirectory("result");
-  writeTo(result, texts);
+void verifyTexts(const Directory& directory, const std::vector<OutputText>& texts) {
+  std::vector<std::string> wanted;
+  for (const OutputText& text : texts) {
+    verify(directory, text);
+    wanted.push_back(text.name);
+  }
+  std::sort(wanted.begin(), wanted.end());
+  std::vector<std::string> names;
+  if (!directory.list(&names)) {
+    fail(directory.path(), "cannot be read back: " + systemError(errno));
+  }
+  if (names != wanted) {
+    fail(directory.path(), "holds other files than those that were written");
+  }
+}
+
+void writeTexts(const std::vector<OutputText>& texts, OutputDirectory* output) {
   output->create();
-  for (const NamedText& text : texts) {
-    output->copyIn(result.directory(), text.name, modeOf(text.name));
+  for (const OutputText& text : texts) {
+    output->write(text);
   }
   output->sync();
-  verify(output->directory(), texts);
-  output->publish();
+  verifyTexts(output->directory(), texts);
 }

@@ -3,23 +3,16 @@
 #ifndef SCHEMA_MIGRATE_TEXT_OUTPUT_H
 #define SCHEMA_MIGRATE_TEXT_OUTPUT_H
 
-#include <libschema-migration/Installation.h>
-#include <sys/types.h>
-
-#include <functional>
-#include <optional>
 #include <string>
 #include <vector>
 
 #include "OutputDirectory.h"
-#include "PrivatePlace.h"
 
-// The mode of a file of this name; that of any new file where there is none.
-using ModeOf = std::function<std::optional<mode_t>(const std::string& name)>;
+// Creates the output directory with these files and no others, brings them to the disk, and makes
+// sure that they are there; it is still to be published. Throws a Failure when that cannot be done.
+void writeTexts(const std::vector<OutputText>& texts, OutputDirectory* output);
 
-// Puts the output in place with these files and no others, brought to the disk, read back and
-// compared. Throws a Failure, with nothing in place, when that cannot be done.
-void publishTexts(const std::vector<migration::NamedText>& texts, const ModeOf& modeOf,
-                  PrivatePlace* place, OutputDirectory* output);
+// Throws a Failure unless the directory holds these files, byte for byte, and no others.
+void verifyTexts(const Directory& directory, const std::vector<OutputText>& texts);
 
 #endif  // SCHEMA_MIGRATE_TEXT_OUTPUT_H

@@ -41,7 +41,8 @@ Installation Installation::fromDirectory(const std::string& directory, const Rea
   auto content = std::make_unique<Content>();
   content->directory = directory;
   std::vector<std::string> names;
-  const std::string problem = listDirectory(directory, &names);
+  const InputDirectory input(directory);
+  const std::string problem = input.list(&names);
   if (!problem.empty()) {
     failures->push_back({directory, 0, 0, "", "the directory cannot be read: " + problem});
   }
@@ -50,7 +51,7 @@ Installation Installation::fromDirectory(const std::string& directory, const Rea
       content->otherFiles.push_back(name);
     }
   }
-  std::uint64_t room = limits.bytes;
+  ReadLimits rest = limits;
   bool isAny = false;
   content->files.reserve(kSchemaFiles.size());
   for (const char* const name : kSchemaFiles) {
@@ -60,13 +61,14 @@ Installation Installation::fromDirectory(const std::string& directory, const Rea
     isAny = true;
     content->present.emplace_back(name);
     std::string path = directory + "/" + name;
-    std::string bytes;
-    const std::string unread = readRegularFile(path, room, &bytes);
+    FileText text;
+    std::string unread = input.read(name, rest, &text);
     if (unread.empty()) {
-      room -= bytes.size();
-      content->addFile(name, std::move(path), std::move(bytes));
+      rest.used += text.bytes.size();
+      content->addFile(name, std::move(path), std::move(text.bytes));
+      content->files.back().mode = text.mode;
     } else {
-      failures->push_back({std::move(path), 0, 0, "", "cannot be read: " + unread});
+      failures->push_back({std::move(path), 0, 0, "", std::move(unread)});
     }
   }
   if (problem.empty() && !isAny) {
@@ -81,7 +83,7 @@ Installation Installation::fromTexts(const std::string& directory, std::vector<N
                                      const ReadLimits& limits, Failures* failures) {
   auto content = std::make_unique<Content>();
   content->directory = directory;
-  std::uint64_t room = limits.bytes;
+  ReadLimits rest = limits;
   content->files.reserve(kSchemaFiles.size());
   for (NamedText& text : texts) {
     if (schemaFileNumber(text.name) == kSchemaFiles.size()) {
@@ -98,13 +100,11 @@ Installation Installation::fromTexts(const std::string& directory, std::vector<N
     }
     content->present.emplace_back(name);
     std::string path = directory.empty() ? name : directory + "/" + name;
-    if (text->bytes.size() > room) {
-      failures->push_back(
-          {std::move(path), 0, 0, "",
-           "cannot be read: it is larger than the limit of " + std::to_string(room) + " bytes"});
+    if (text->bytes.size() > rest.room()) {
+      failures->push_back({std::move(path), 0, 0, "", rest.exceeded()});
       continue;
     }
-    room -= text->bytes.size();
+    rest.used += text->bytes.size();
     content->addFile(name, std::move(path), std::move(text->bytes));
   }
   std::sort(content->otherFiles.begin(), content->otherFiles.end());
@@ -112,6 +112,14 @@ Installation Installation::fromTexts(const std::string& directory, std::vector<N
 }
 
 const std::string& Installation::directory() const { return m_content->directory; }
+
+std::uint64_t Installation::size() const {
+  std::uint64_t size = 0;
+  for (const SchemaFile& file : m_content->files) {
+    size += file.source->bytes().size();
+  }
+  return size;
+}
 
 const std::vector<SchemaFile>& Installation::files() const { return m_content->files; }
 

@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "Finding.h"
+#include "InputFiles.h"
 #include "Kept.h"
 #include "Written.h"
 
@@ -29,7 +30,8 @@ constexpr std::array<const char*, 9> kSchemaFiles = {
 std::size_t schemaFileNumber(std::string_view name);
 
 struct SchemaFile {
-  std::string name;  // "V3.user.at"
+  std::string name;   // "V3.user.at"
+  unsigned mode = 0;  // its permissions; 0 in memory
   std::unique_ptr<Source> source;
   std::unique_ptr<WrittenFile> written;
   std::unique_ptr<KeptFile> kept;
@@ -64,10 +66,6 @@ struct Reference {
   Place place() const { return file->source->placeOf(offset); }
 };
 
-struct ReadLimits {
-  std::uint64_t bytes = std::uint64_t{1} << 30;  // of all files together
-};
-
 // The content of a file by its name, for an installation that lies in memory.
 struct NamedText {
   std::string name;
@@ -88,6 +86,8 @@ class Installation {
   ~Installation();
 
   const std::string& directory() const;
+  // Of all files together.
+  std::uint64_t size() const;
   // Those that are there, in the order of kSchemaFiles; null for one that is not.
   const std::vector<SchemaFile>& files() const;
   const SchemaFile* file(std::string_view name) const;

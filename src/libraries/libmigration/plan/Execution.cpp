@@ -3,6 +3,7 @@
 #include <libschema/SchemaManager.h>
 
 #include <algorithm>
+#include <array>
 #include <cerrno>
 #include <fstream>
 #include <iterator>
@@ -23,15 +24,20 @@ namespace {
 // Ends the execution, with what is to be told.
 struct Stop {
   Failure failure;
+  bool isOfPlan = false;  // the library does otherwise than planned
 };
 
 [[noreturn]] void stop(const std::string& file, const std::string& text) {
-  throw Stop{{file, 0, 0, "", text}};
+  throw Stop{{file, 0, 0, "", text}, true};
+}
+
+[[noreturn]] void stopWriting(const std::string& file, const std::string& text) {
+  throw Stop{{file, 0, 0, "", text + "; is there space left for private copies?"}};
 }
 
 [[noreturn]] void stopSystem(const std::string& file, const std::string& text) {
   const int error = errno;
-  stop(file, text + ": " + std::generic_category().message(error));
+  throw Stop{{file, 0, 0, "", text + ": " + std::generic_category().message(error)}};
 }
 
 void writeText(const std::string& path, const std::string& bytes) {
@@ -76,8 +82,23 @@ std::string listOf(const ThreeWay& threeWay, Outcome outcome) {
   return text;
 }
 
+// The library must come to the end of what it is given.
+void guard(const std::string& folder, const NamedText& text) {
+  const Source source(text.name, text.bytes);
+  const KeptFile kept(source);
+  if (kept.ending() != ReadingEnd::kWhole) {
+    const Place place = source.placeOf(kept.endOffset());
+    throw Stop{{folder + "/" + text.name, place.line, place.column, "",
+                "the library would not come to the end of the private copy"},
+               true};
+  }
+}
+
 std::unique_ptr<SchemaManager> readAll(const std::string& folder,
                                        const std::vector<NamedText>& texts) {
+  for (const NamedText& text : texts) {
+    guard(folder, text);
+  }
   auto manager = std::make_unique<SchemaManager>(folder);
   for (const char* const name : kSchemaFiles) {
     const bool isThere = std::any_of(texts.begin(), texts.end(),
@@ -98,10 +119,16 @@ std::vector<NamedText> writeAll(SchemaManager* manager, const std::string& folde
     if (isConfigFile(file)) {
       continue;
     }
+    const std::string path = folder + "/" + file;
     if (manager->writeFile(folder, file) != 0) {
-      stop(folder + "/" + file, "the library cannot write it");
+      stopWriting(path, "cannot be created");
     }
-    texts.push_back({file, readText(folder + "/" + file)});
+    texts.push_back({file, readText(path)});
+    // The library does not notice that a write fails.
+    const std::string& bytes = texts.back().bytes;
+    if (!bytes.empty() && bytes.back() != '\n') {
+      stopWriting(path, "was not written completely");
+    }
   }
   return texts;
 }
@@ -152,6 +179,32 @@ void proveAlike(const std::vector<NamedText>& merged, const std::vector<NamedTex
   }
 }
 
+// What the result has must be read again as it is written.
+Failures unwritable(const ThreeWay& threeWay) {
+  constexpr std::array<const char*, 3> kKeywords = {
+      "attributetypes=", "objectclasses=", "ORVAttributetypes="};
+  Failures failures;
+  for (const Verdict& row : threeWay.differences) {
+    if (!row.isCarried()) {
+      continue;
+    }
+    const Source source(
+        "result", kKeywords[static_cast<std::size_t>(row.kind())] + textOf(*row.result) + "\n");
+    const KeptFile kept(source);
+    if (kept.ending() != ReadingEnd::kWhole || kept.definitions().size() != 1 ||
+        contentOf(kept.definitions().front()).values != row.result->values) {
+      const Entry& entry = row.entry();
+      failures.push_back(
+          {entry.file->source->path(), entry.place().line, entry.place().column, "",
+           describe(row) +
+               " would not be read again as it is written: a value in quotes that is neither a "
+               "name nor a description, an empty value and a second SUP do not survive; decide "
+               "what comes of it, with a text of its own or NEW's, or exclude its OID"});
+    }
+  }
+  return failures;
+}
+
 std::string idOf(const Verdict& row) {
   return static_cast<char>('0' + static_cast<int>(row.kind())) + oidInResult(row);
 }
@@ -188,7 +241,8 @@ namespace {
 
 Failures compareWithPlan(const ThreeWay& threeWay, const std::vector<NamedText>& texts) {
   Failures failures;
-  const Installation result = Installation::fromTexts("result", texts, ReadLimits(), &failures);
+  const Installation result =
+      Installation::fromTexts("result", texts, ReadLimits::none(), &failures);
   const Failures found = differencesFromPlan(threeWay, result);
   failures.insert(failures.end(), found.begin(), found.end());
   return failures;
@@ -199,6 +253,11 @@ Failures compareWithPlan(const ThreeWay& threeWay, const std::vector<NamedText>&
 Execution execute(const ThreeWayRequest& request, const ThreeWay& threeWay,
                   const std::string& directory) {
   Execution execution;
+  execution.failures = unwritable(threeWay);
+  execution.departsFromPlan = !execution.failures.empty();
+  if (execution.departsFromPlan) {
+    return execution;
+  }
   try {
     execution.inNewsLayout = inNewsLayout(request, threeWay);
     execution.inLibraryLayout = mergeByLibrary(request, threeWay, directory);
@@ -209,9 +268,11 @@ Execution execute(const ThreeWayRequest& request, const ThreeWay& threeWay,
       }
     }
     execution.failures = compareWithPlan(threeWay, execution.inNewsLayout);
+    execution.departsFromPlan = !execution.failures.empty();
     execution.notCarriedByLibrary = compareWithPlan(threeWay, execution.inLibraryLayout);
   } catch (const Stop& stopped) {
     execution.failures.push_back(stopped.failure);
+    execution.departsFromPlan = stopped.isOfPlan;
   }
   return execution;
 }

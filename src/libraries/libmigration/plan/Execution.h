@@ -25,6 +25,8 @@ struct Execution {
 
   // Why there is no result; empty when all went as planned. The texts mean nothing otherwise.
   Failures failures;
+  // The failures are about definitions of which the library makes something else than planned.
+  bool departsFromPlan = false;
 
   // What NEW itself holds that the library's writer does not carry, a failure for each definition:
   // then there is no result in that layout.

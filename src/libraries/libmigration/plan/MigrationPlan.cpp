@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <map>
 #include <set>
+#include <tuple>
 #include <utility>
 
 #include "Check.h"
@@ -37,7 +38,7 @@ bool isBroken(const Finding& finding) {
 void checkResult(MigrationPlan* plan) {
   plan->resultTexts = inNewsLayout(plan->request, plan->threeWay);
   plan->result =
-      Installation::fromTexts("result", plan->resultTexts, plan->limits, &plan->refusals);
+      Installation::fromTexts("result", plan->resultTexts, ReadLimits::none(), &plan->refusals);
   std::map<std::string, std::size_t> seen;
   for (Finding& finding : checked(*plan->result)) {
     const std::string key = keyOf(finding);
@@ -66,7 +67,7 @@ void draw(MigrationPlan* plan) {
 class PlanMaker {
  public:
   explicit PlanMaker(const PlanRequest& request)
-      : m_request(request), m_plan(std::make_unique<MigrationPlan>()) {}
+      : m_request(request), m_limits(request.limits), m_plan(std::make_unique<MigrationPlan>()) {}
 
   std::unique_ptr<MigrationPlan> make() {
     m_plan->asked = m_request;
@@ -94,7 +95,6 @@ class PlanMaker {
   // ---- Inputs ----
 
   void readInputs() {
-    m_plan->limits = m_request.limits;
     if (!m_request.base.empty()) {
       tell("reading BASE");
       m_plan->base = readInstallation("base", m_request.base);
@@ -122,30 +122,45 @@ class PlanMaker {
   }
 
   std::optional<Installation> readInstallation(const char* role, const std::string& directory) {
-    Installation installation =
-        Installation::fromDirectory(directory, m_request.limits, &m_plan->failures);
+    Installation installation = Installation::fromDirectory(directory, m_limits, &m_plan->failures);
+    m_limits.used += installation.size();
     for (const SchemaFile& file : installation.files()) {
       note(role, *file.source);
-      if (file.kept->ending() == ReadingEnd::kNeverEnds) {
-        failAt(file, "the server's library would never come to the end of this file");
-      } else if (file.kept->ending() == ReadingEnd::kFails) {
-        failAt(file, "the server's library fails to read this file");
+      if (file.kept->ending() != ReadingEnd::kWhole) {
+        failToRead(file);
       }
     }
     return installation;
   }
 
-  void failAt(const SchemaFile& file, const std::string& text) {
+  // What is wrong with the text up to there, and then that the library does not get past it.
+  void failToRead(const SchemaFile& file) {
     const Place place = file.source->placeOf(file.kept->endOffset());
+    Findings findings;
+    checkText(file, &findings);
+    std::stable_sort(findings.begin(), findings.end(),
+                     [](const Finding& one, const Finding& other) {
+                       return std::tie(one.line, one.column) < std::tie(other.line, other.column);
+                     });
+    for (const Finding& finding : findings) {
+      if (finding.severity == Severity::kError && finding.line <= place.line) {
+        m_plan->failures.push_back(
+            {finding.file, finding.line, finding.column, finding.rule, finding.text});
+      }
+    }
     m_plan->failures.push_back(
-        {file.source->path(), place.line, place.column, "", text + "; check tells what is wrong"});
+        {file.source->path(), place.line, place.column, "",
+         file.kept->ending() == ReadingEnd::kNeverEnds
+             ? "the server's library would never come to the end of this file, and stands here"
+             : "the server's library fails to read this file, and stops here"});
   }
 
   const Source* readFile(const char* role, const std::string& path) {
-    std::unique_ptr<Source> source = readSource(path, m_request.limits.bytes, &m_plan->failures);
+    std::unique_ptr<Source> source = readSource(path, m_limits, &m_plan->failures);
     if (source == nullptr) {
       return nullptr;
     }
+    m_limits.used += source->bytes().size();
     note(role, *source);
     m_plan->lists.push_back(std::move(source));
     return m_plan->lists.back().get();
@@ -207,7 +222,8 @@ class PlanMaker {
 
   // What the library's reading loses must not get lost unseen.
   void refuseLoss(const Finding& finding) {
-    const bool isLoss = finding.rule.front() == 'L' || finding.rule.front() == 'D';
+    const bool isLoss =
+        finding.rule.front() == 'L' || finding.rule.front() == 'D' || finding.rule == "O501";
     if (isLoss && finding.severity == Severity::kError) {
       m_plan->refusals.push_back(
           {finding.file, finding.line, finding.column, finding.rule, finding.text});
@@ -232,6 +248,7 @@ class PlanMaker {
   }
 
   const PlanRequest& m_request;
+  ReadLimits m_limits;
   std::unique_ptr<MigrationPlan> m_plan;
   std::vector<const Source*> m_excludeLists;
   const Source* m_withdrawList = nullptr;

@@ -66,7 +66,6 @@ struct MigrationPlan {
   std::optional<Installation> old;
   std::optional<Installation> latest;
   std::vector<std::unique_ptr<Source>> lists;
-  ReadLimits limits;
 
   // How often OLD or NEW has what the rules find, by rule and definition; the result may, too.
   std::map<std::string, std::size_t> knownFindings;

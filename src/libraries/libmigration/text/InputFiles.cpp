@@ -8,7 +8,6 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstddef>
-#include <limits>
 #include <system_error>
 #include <utility>
 
@@ -32,21 +31,37 @@ const char* kindOf(mode_t mode) {
   }
 }
 
+bool isSameTime(const timespec& one, const timespec& other) {
+  return one.tv_sec == other.tv_sec && one.tv_nsec == other.tv_nsec;
+}
+
+// As it is given: "1 GiB", "1500 bytes".
+std::string shownSize(std::uint64_t bytes) {
+  constexpr const char* kUnits[] = {"KiB", "MiB", "GiB", "TiB"};
+  std::string text = std::to_string(bytes) + (bytes == 1 ? " byte" : " bytes");
+  for (const char* const unit : kUnits) {
+    if (bytes == 0 || bytes % 1024 != 0) {
+      break;
+    }
+    bytes /= 1024;
+    text = std::to_string(bytes) + " " + unit;
+  }
+  return text;
+}
+
 class OpenFile {
  public:
   // Without blocking: a FIFO that nobody writes to would hold an ordinary open for ever.
-  explicit OpenFile(const std::string& path)
-      : m_descriptor(::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC)) {
-    struct stat status {};
-    if (m_descriptor < 0 || ::fstat(m_descriptor, &status) != 0) {
+  OpenFile(int directory, const std::string& name)
+      : m_descriptor(
+            ::openat(directory, name.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC)) {
+    if (m_descriptor < 0 || ::fstat(m_descriptor, &m_status) != 0) {
       const int error = errno;
       struct stat named {};
-      const bool isSocket = error == ENXIO && ::stat(path.c_str(), &named) == 0;
+      const bool isSocket = error == ENXIO && ::fstatat(directory, name.c_str(), &named, 0) == 0;
       m_problem = isSocket ? kindOf(named.st_mode) : systemErrorText(error);
-    } else if (!S_ISREG(status.st_mode)) {
-      m_problem = kindOf(status.st_mode);
-    } else {
-      m_size = static_cast<std::uint64_t>(status.st_size);
+    } else if (!S_ISREG(m_status.st_mode)) {
+      m_problem = kindOf(m_status.st_mode);
     }
   }
   OpenFile(const OpenFile&) = delete;
@@ -57,9 +72,28 @@ class OpenFile {
     }
   }
 
+  // Empty while all is well.
   const std::string& problem() const { return m_problem; }
-  std::uint64_t size() const { return m_size; }
+  std::uint64_t size() const { return static_cast<std::uint64_t>(m_status.st_size); }
+  unsigned mode() const { return m_status.st_mode & 07777; }
 
+  // All of it. Of a file that grows no more is read than it had at first, and one byte.
+  std::string readAll() {
+    std::string bytes(static_cast<std::size_t>(size()) + 1, '\0');
+    std::size_t done = 0;
+    while (const std::size_t count = read(bytes.data() + done, bytes.size() - done)) {
+      done += count;
+    }
+    if (m_problem.empty()) {
+      noteChange(done);
+    }
+    bytes.resize(done);
+    return bytes;
+  }
+
+  bool isChanged() const { return m_isChanged; }
+
+ private:
   // 0 at the end, and after an error.
   std::size_t read(char* place, std::size_t size) {
     ssize_t count = 0;
@@ -73,64 +107,74 @@ class OpenFile {
     return static_cast<std::size_t>(count);
   }
 
- private:
+  void noteChange(std::size_t read) {
+    struct stat after {};
+    if (::fstat(m_descriptor, &after) != 0) {
+      m_problem = systemErrorText(errno);
+      return;
+    }
+    m_isChanged = read != size() || after.st_size != m_status.st_size ||
+                  !isSameTime(after.st_mtim, m_status.st_mtim) ||
+                  !isSameTime(after.st_ctim, m_status.st_ctim);
+  }
+
   int m_descriptor;
-  std::uint64_t m_size = 0;
+  struct stat m_status {};
   std::string m_problem;
+  bool m_isChanged = false;
 };
+
+std::string readFileIn(int directory, const std::string& name, const ReadLimits& limits,
+                       FileText* text) {
+  text->bytes.clear();
+  OpenFile file(directory, name);
+  if (file.problem().empty() && file.size() > limits.room()) {
+    return limits.exceeded();
+  }
+  std::string bytes = file.problem().empty() ? file.readAll() : std::string();
+  if (!file.problem().empty()) {
+    return "cannot be read: " + file.problem();
+  }
+  if (file.isChanged()) {
+    return "changed while it was read; try again when nothing writes to it";
+  }
+  text->bytes = std::move(bytes);
+  text->mode = file.mode();
+  return "";
+}
 
 struct CloseDirectory {
   void operator()(DIR* directory) const { ::closedir(directory); }
 };
 
+constexpr int kDirectoryFlags = O_RDONLY | O_DIRECTORY | O_CLOEXEC;
+
 }  // namespace
+
+std::string ReadLimits::exceeded() const {
+  return "with this file the inputs have more than " + shownSize(bytes) + " in all" +
+         (advice.empty() ? "" : "; " + advice);
+}
 
 std::string systemErrorText(int error) { return std::generic_category().message(error); }
 
-std::string readRegularFile(const std::string& path, std::uint64_t limit, std::string* bytes) {
-  limit = std::min<std::uint64_t>(limit, std::numeric_limits<std::int64_t>::max());
-  bytes->clear();
-  OpenFile file(path);
-  // What the file grows by while it is read is read as well, so that its end is met in any case.
-  constexpr std::size_t kStep = 1 << 16;
-  std::uint64_t room = file.size() + 1;
-  std::size_t size = 0;
-  while (file.problem().empty() && room <= limit + 1) {
-    bytes->resize(static_cast<std::size_t>(room));
-    const std::size_t count = file.read(bytes->data() + size, bytes->size() - size);
-    size += count;
-    if (count == 0) {
-      break;
-    }
-    if (size == bytes->size()) {
-      room = size > limit ? limit + 2 : std::min<std::uint64_t>(size + kStep, limit + 1);
-    }
+InputDirectory::InputDirectory(const std::string& path)
+    : m_descriptor(::open(path.c_str(), kDirectoryFlags)), m_error(m_descriptor < 0 ? errno : 0) {}
+
+InputDirectory::~InputDirectory() {
+  if (m_descriptor >= 0) {
+    ::close(m_descriptor);
   }
-  bytes->resize(size);
-  std::string problem = file.problem();
-  if (problem.empty() && (room > limit + 1 || size > limit)) {
-    problem = "it is larger than the limit of " + std::to_string(limit) + " bytes";
-  }
-  if (!problem.empty()) {
-    bytes->clear();
-  }
-  return problem;
 }
 
-std::unique_ptr<Source> readSource(const std::string& path, std::uint64_t limit,
-                                   Failures* failures) {
-  std::string bytes;
-  const std::string problem = readRegularFile(path, limit, &bytes);
-  if (!problem.empty()) {
-    failures->push_back({path, 0, 0, "", "cannot be read: " + problem});
-    return nullptr;
-  }
-  return std::make_unique<Source>(path, std::move(bytes));
-}
-
-std::string listDirectory(const std::string& path, std::vector<std::string>* names) {
+std::string InputDirectory::list(std::vector<std::string>* names) const {
   names->clear();
-  const std::unique_ptr<DIR, CloseDirectory> open(::opendir(path.c_str()));
+  if (m_error != 0) {
+    return systemErrorText(m_error);
+  }
+  // Opened anew, since the listing has a position, and takes the descriptor.
+  const int again = ::openat(m_descriptor, ".", kDirectoryFlags);
+  const std::unique_ptr<DIR, CloseDirectory> open(again < 0 ? nullptr : ::fdopendir(again));
   if (open == nullptr) {
     return systemErrorText(errno);
   }
@@ -145,6 +189,26 @@ std::string listDirectory(const std::string& path, std::vector<std::string>* nam
   }
   std::sort(names->begin(), names->end());
   return "";
+}
+
+std::string InputDirectory::read(const std::string& name, const ReadLimits& limits,
+                                 FileText* text) const {
+  return readFileIn(m_descriptor, name, limits, text);
+}
+
+std::string readFile(const std::string& path, const ReadLimits& limits, FileText* text) {
+  return readFileIn(AT_FDCWD, path, limits, text);
+}
+
+std::unique_ptr<Source> readSource(const std::string& path, const ReadLimits& limits,
+                                   Failures* failures) {
+  FileText text;
+  std::string problem = readFile(path, limits, &text);
+  if (!problem.empty()) {
+    failures->push_back({path, 0, 0, "", std::move(problem)});
+    return nullptr;
+  }
+  return std::make_unique<Source>(path, std::move(text.bytes));
 }
 
 }  // namespace migration

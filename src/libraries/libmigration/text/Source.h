@@ -44,7 +44,14 @@ class Source {
  private:
   std::string m_path;
   std::string m_bytes;
-  std::vector<std::size_t> m_lineStarts;
+  // Where each stretch of bytes begins: a file of line ends alone must not take more room than its
+  // bytes do.
+  struct Stretch {
+    std::uint64_t line;     // the number of the line
+    std::size_t lineStart;  // where that line begins
+  };
+  void count(std::size_t from, std::size_t to, Stretch* stretch) const;
+  std::vector<Stretch> m_stretches;
 };
 
 }  // namespace migration
