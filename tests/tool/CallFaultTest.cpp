@@ -68,7 +68,7 @@ TEST_F(CallFault, ListingThatFailsPartWay) {
     if (exitCode != 0) {
       EXPECT_NE(std::string::npos, err.find(": Input/output error\n")) << err;
     }
-    ofOld += err == "@/old: error: the directory of OLD cannot be read: Input/output error\n" &&
+    ofOld += err == "@/old: error: the directory cannot be read: Input/output error\n" &&
                      exitCode == 3
                  ? 1
                  : 0;

@@ -178,7 +178,8 @@ TEST_F(Planned, ADryRunDoesEverythingButPublish) {
   const ToolResult result = run("migrate", {"--base", "@/base", "--out", "@/out", "--dry-run"});
   EXPECT_EQ(result.err, "");
   EXPECT_EQ(result.exitCode, 0);
-  EXPECT_NE(result.out.find("\nNot written, as this was a dry run: @/out\n"), std::string::npos);
+  EXPECT_NE(result.out.find("\nVerified, but not written, as this was a dry run: @/out\n"),
+            std::string::npos);
   EXPECT_EQ(m_folder.names(), "base new old");
 }
 

@@ -242,8 +242,7 @@ std::string warningsOf(const MigrationPlan& plan) {
   for (const migration::Finding& finding : plan.ofInputs) {
     const char family = finding.rule.front();
     const bool isUnread = finding.rule == "I702" || finding.rule == "I703";
-    const bool isLost = (family == 'T' || family == 'O') &&
-                        finding.severity == migration::Severity::kError &&
+    const bool isLost = family == 'T' && finding.severity == migration::Severity::kError &&
                         !isRefused(plan, finding);
     if (isUnread || isLost) {
       lines += warningLine(placeTold(finding), textTold(finding));

@@ -35,8 +35,8 @@ std::string renderDifferences(const migration::MigrationPlan& plan, const ShownD
 // What the rules of check say of the inputs, a line each; empty when they say nothing.
 std::string renderFindings(const migration::MigrationPlan& plan);
 
-// A line for each definition or OID of a list that counts for nothing, and for each file that is
-// not read, for standard error.
+// A line for each definition that counts for nothing, and for each file that is not read, for
+// standard error.
 std::string warningsOf(const migration::MigrationPlan& plan);
 
 // A line for whatever refuses the plan and for each definition that is undecided, for standard

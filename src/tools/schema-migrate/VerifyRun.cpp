@@ -23,8 +23,9 @@ using migration::PlannedFiles;
 
 Installation readOutput(const VerifyOptions& options) {
   Failures failures;
-  Installation output =
-      Installation::fromDirectory(options.directory, {options.maxInput}, &failures);
+  migration::ReadLimits limits;
+  limits.bytes = options.maxInput;
+  Installation output = Installation::fromDirectory(options.directory, limits, &failures);
   if (!failures.empty()) {
     std::string lines;
     for (const migration::Failure& failure : failures) {
