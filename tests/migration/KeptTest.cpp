@@ -206,7 +206,7 @@ struct EndingCase {
   ReadingEnd ending;
 };
 
-const EndingCase kEndings[] = {
+const EndingCase kEndingCases[] = {
     {"EmptyFile", "", ReadingEnd::kWhole},
     {"JunkOnly", "a ( b ) '", ReadingEnd::kWhole},
     {"StringCutOffByALineEnd",
@@ -271,7 +271,7 @@ const EndingCase kEndings[] = {
 };
 
 TEST(KeptEnding, IsThatOfTheManager) {
-  for (const EndingCase& row : kEndings) {
+  for (const EndingCase& row : kEndingCases) {
     SCOPED_TRACE(row.name);
     const Source source(kFile, row.text);
     EXPECT_EQ(row.ending, KeptFile(source).ending());
