@@ -41,8 +41,8 @@ void report(const MigrationPlan& plan, const MigrateOptions& options, Console* c
   if (options.isJson) {
     console->print(renderPlanJson(plan, shown, "migrate"));
   } else {
-    console->printText(renderDifferences(plan, shown, {isColourWanted(), false}) +
-                       renderFindings(plan));
+    console->printText(renderFindings(plan) +
+                       renderDifferences(plan, shown, {isColourWanted(), false}));
   }
 }
 

@@ -101,8 +101,9 @@ class PlanCommand : public Command {
     if (isJson) {
       console->print(document);
     } else {
-      console->printText(renderDifferences(*plan, shownOf(*plan, {}), style) +
-                         renderFindings(*plan) + "\n" + renderReadiness(*plan, style));
+      console->printText(renderFindings(*plan) +
+                         renderDifferences(*plan, shownOf(*plan, {}), style) + "\n" +
+                         renderReadiness(*plan, style));
     }
     std::string lines = warningsOf(*plan) + whyNotReady(*plan);
     console->complain(&lines);

@@ -234,7 +234,7 @@ std::string renderFindings(const MigrationPlan& plan) {
                  ? errorLine(placeTold(finding), textTold(finding))
                  : warningLine(placeTold(finding), textTold(finding));
   }
-  return lines.empty() ? "" : "\nWhat check says of the inputs:\n" + lines;
+  return lines.empty() ? "" : "What check says of the inputs:\n" + lines + "\n";
 }
 
 std::string warningsOf(const MigrationPlan& plan) {
