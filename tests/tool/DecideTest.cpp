@@ -60,7 +60,7 @@ TEST_F(Deciding, AQuestionTellsTheDifferenceClauseByClauseWhatDependsOnItAndTheC
             "  in two ways: KIND\n"
             "  BASE V3.system.oc:1, OLD V3.system.oc:1, NEW V3.system.oc:1\n"
             "\n"
-            "  KIND, changed in two ways [structure]\n"
+            "  KIND, to be decided [structure]\n"
             "    base     ABSTRACT\n"
             "    old      AUXILIARY\n"
             "    new      STRUCTURAL\n"
@@ -442,6 +442,25 @@ TEST_F(Deciding, AnAnswerSettlesAndOpensOtherQuestions) {
       << text;
   EXPECT_NE(text.find("Question 2 of 3: vendor extension 3.1\n"), std::string::npos) << text;
   EXPECT_NE(text.find("\n  It belongs to attribute type p (3.1).\n"), std::string::npos) << text;
+  run.type("q");
+  run.rest();
+}
+
+TEST_F(Deciding, AClauseThatASideLacksIsToldSo) {
+  m_folder.install("old2",
+                   {{"V3.user.at", attribute("1.1 NAME 'a' SUP b USAGE userApplications")}});
+  m_folder.install("new2", {{"V3.user.at", attribute("1.1 NAME 'a' EQUALITY m SYNTAX 1.2{3} USAGE "
+                                                     "userApplications")}});
+  TerminalRun run(m_folder, {"decide", "--from", "old2", "--to", "new2", "--decisions", "d.toml"});
+  const std::string text = onScreen(run.until("Your choice: "));
+  EXPECT_NE(text.find("  SUP, to be decided [structure]\n"
+                      "    old      b\n"
+                      "    new      (none)\n"
+                      "  MATCHING, to be decided [data]\n"
+                      "    old      (none)\n"
+                      "    new      EQUALITY m SYNTAX 1.2{3}\n"),
+            std::string::npos)
+      << text;
   run.type("q");
   run.rest();
 }

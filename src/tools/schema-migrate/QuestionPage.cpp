@@ -31,7 +31,8 @@ std::string paragraph(std::size_t indent, const std::string& text, const PageSty
 }
 
 std::string shownClause(const ClauseChange& change, const Values& values) {
-  return values.empty() ? kNothingThere : wholePrintable(shownValue(change.aspect, values));
+  const std::string text = values.empty() ? "" : wholePrintable(shownValue(change.aspect, values));
+  return text.empty() ? kNothingThere : text;
 }
 
 std::string textOf(const Entry& entry) {
@@ -90,7 +91,7 @@ std::string clauseLines(const Verdict& row, bool hasBase, const PageStyle& style
   for (const ClauseChange& change : row.clauses) {
     text += paragraph(
         2,
-        std::string(nameOf(change.aspect)) + (change.isDecided ? "" : ", changed in two ways") +
+        std::string(nameOf(change.aspect)) + (change.isDecided ? "" : ", to be decided") +
             (change.risk == migration::Risk::kNone ? ""
                                                    : " [" + std::string(wordOf(change.risk)) + "]"),
         style);
