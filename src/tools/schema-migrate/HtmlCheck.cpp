@@ -31,8 +31,9 @@ std::size_t firstLength(const std::string& text) {
 }
 
 void addDefinition(const Json& finding, Dictionary* row) {
-  if (finding.at("definition") != "") {
-    addText(row, "OF", "TEXT", finding.at("definition").get<std::string>());
+  const std::string definition = finding.at("definition");
+  if (!definition.empty()) {
+    addText(row, "OF", "TEXT", definition);
   }
 }
 

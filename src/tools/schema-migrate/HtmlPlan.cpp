@@ -95,8 +95,9 @@ class PlanPage {
         Dictionary* const row = list->AddSectionDictionary("REFUSAL");
         setText(row, "PLACE", placeText(refusal));
         setText(row, "TEXT", refusal.at("text").get<std::string>());
-        if (refusal.at("rule") != "") {
-          addText(row, "RULE", "ID", refusal.at("rule").get<std::string>());
+        const std::string rule = refusal.at("rule");
+        if (!rule.empty()) {
+          addText(row, "RULE", "ID", rule);
         }
       }
     }
