@@ -86,6 +86,24 @@ TEST_F(Html, ThePageDoesNotChangeWhatIsPrinted) {
   }
 }
 
+TEST_F(Html, MigrateTellsItsPlan) {
+  const ToolResult refused = run("migrate", {"--out", "@/out", "--html", "@/page.html"});
+  EXPECT_EQ(4, refused.exitCode);
+  EXPECT_TRUE(has(page(), "<title>Migration"));
+  EXPECT_TRUE(has(page(), "must not go ahead: 1 definition undecided."));
+  const ToolResult done =
+      run("migrate", {"--out", "@/out", "--prefer", "old", "--html", "@/page.html"});
+  EXPECT_EQ(0, done.exitCode) << done.err;
+  EXPECT_TRUE(has(page(), "The migration may go ahead"));
+  EXPECT_EQ("new old out page.html", m_folder.names());
+}
+
+TEST_F(Html, NothingIsMigratedWithoutThePage) {
+  m_folder.write("mine", "mine");
+  EXPECT_EQ(5, run("migrate", {"--out", "@/out", "--prefer", "old", "--html", "@/mine"}).exitCode);
+  EXPECT_EQ("mine new old", m_folder.names());
+}
+
 TEST_F(Html, TheSameRunGivesTheSamePage) {
   run("plan", {"--html", "@/page.html"});
   run("plan", {"--html", "@/again.html"});

@@ -4,17 +4,16 @@
 #include <libschema-migration/Settings.h>
 
 #include <CLI/CLI.hpp>
-#include <optional>
 
 #include "CheckRun.h"
 #include "Command.h"
 #include "CommandLine.h"
+#include "HtmlOption.h"
 #include "HtmlReport.h"
 #include "Messages.h"
 #include "Progress.h"
 #include "Renderers.h"
 #include "RepairRun.h"
-#include "ReportFile.h"
 #include "Terminal.h"
 
 namespace {
@@ -88,7 +87,7 @@ class CheckCommand : public Command {
     check->add_option("--format", m_format, "text, json, sarif or github")
         ->check(oneOf({"text", "json", "sarif", "github"}))
         ->type_name("FORMAT");
-    addHtml(check, &m_html);
+    m_html.declare(check);
     check->add_flag("--context", m_isWithContext,
                     "show the line of each finding, as on a terminal");
     check
@@ -106,7 +105,7 @@ class CheckCommand : public Command {
     m_options.doWarningsFail = m_failOn == "warning";
     const bool isJson = m_format == "json";
     const bool isWithContext = m_format == "text" && (m_isWithContext || isOnTerminal());
-    m_options.isWithExcerpts = isWithContext || isJson || !m_html.empty();
+    m_options.isWithExcerpts = isWithContext || isJson || m_html.isWanted();
     for (const std::string& word : m_rules) {
       const std::size_t at = word.find('=');
       migration::severityOf(word.substr(at + 1), &m_options.severities[word.substr(0, at)]);
@@ -116,16 +115,12 @@ class CheckCommand : public Command {
                     errorLine("--repair takes one DIR; schema-migrate check --help tells how "
                               "it is used"));
     }
-    std::optional<ReportFile> page;
-    if (!m_html.empty()) {
-      page.emplace(m_html, kHtmlBeginning);
-    }
+    m_html.open();
     progress::step("reading and checking");
     const CheckReport report = m_repair.out.empty() ? checkDirectories(m_options)
                                                     : repairDirectory(m_options, m_repair, console);
-    if (page) {
-      page->write(renderCheckHtml(renderJson(report)));
-      page->put();
+    if (m_html.isWanted()) {
+      m_html.write(renderCheckHtml(renderJson(report)));
     }
     std::string failures = renderFailures(report);
     console->complain(&failures);
@@ -156,7 +151,7 @@ class CheckCommand : public Command {
   std::vector<std::string> m_rules;  // "D205=off"
   std::string m_failOn = "error";
   std::string m_format = "text";
-  std::string m_html;
+  HtmlOption m_html;
   bool m_isWithContext = false;
 };
 

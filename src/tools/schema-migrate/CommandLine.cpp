@@ -185,14 +185,6 @@ CLI::Option* addList(CLI::App* command, const std::string& name, std::vector<std
       ->allow_extra_args(false);
 }
 
-void addHtml(CLI::App* command, std::string* path) {
-  command
-      ->add_option("--html", *path,
-                   "write the report as a page for a browser, too; FILE may be one of before")
-      ->check(notEmpty())
-      ->type_name("FILE");
-}
-
 CLI::Validator notEmpty() {
   return {[](const std::string& value) {
             return value.empty() ? std::string("the name is empty") : std::string();

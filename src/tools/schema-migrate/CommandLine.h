@@ -25,9 +25,6 @@ Command* parseCommandLine(int argc, char** argv, const Commands& commands, int* 
 CLI::Option* addList(CLI::App* command, const std::string& name, std::vector<std::string>* values,
                      const std::string& type, const std::string& description);
 
-// Adds --html.
-void addHtml(CLI::App* command, std::string* path);
-
 // Refuses what an unset variable of a shell leaves of an option.
 CLI::Validator notEmpty();
 

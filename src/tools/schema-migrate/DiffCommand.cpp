@@ -2,15 +2,14 @@
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
-#include <optional>
 
 #include "Command.h"
 #include "CommandLine.h"
+#include "HtmlOption.h"
 #include "HtmlReport.h"
 #include "Messages.h"
 #include "PlanOptions.h"
 #include "PlanReport.h"
-#include "ReportFile.h"
 #include "Terminal.h"
 
 namespace {
@@ -71,24 +70,21 @@ class DiffCommand : public Command {
     diff->add_option("--format", m_format, "text or json")
         ->check(oneOf({"text", "json"}))
         ->type_name("FORMAT");
-    addHtml(diff, &m_html);
+    m_html.declare(diff);
     return diff;
   }
 
   int run(Console* console) override {
     m_filter.isWithSame = std::find(m_filter.changes.begin(), m_filter.changes.end(), "same") !=
                           m_filter.changes.end();
-    std::optional<ReportFile> page;
-    if (!m_html.empty()) {
-      page.emplace(m_html, kHtmlBeginning);
-    }
+    m_html.open();
     const std::unique_ptr<migration::MigrationPlan> plan = m_options.makePlan();
     const ShownDifferences shown = shownOf(*plan, m_filter);
     const bool isJson = m_format == "json";
-    const std::string document = isJson || page ? renderPlanJson(*plan, shown, "diff") : "";
-    if (page) {
-      page->write(renderPlanHtml(document));
-      page->put();
+    const std::string document =
+        isJson || m_html.isWanted() ? renderPlanJson(*plan, shown, "diff") : "";
+    if (m_html.isWanted()) {
+      m_html.write(renderPlanHtml(document));
     }
     if (isJson) {
       console->print(document);
@@ -106,7 +102,7 @@ class DiffCommand : public Command {
   PlanOptions m_options;
   DifferenceFilter m_filter;
   std::string m_format = "text";
-  std::string m_html;
+  HtmlOption m_html;
   bool m_isSummaryOnly = false;
 };
 

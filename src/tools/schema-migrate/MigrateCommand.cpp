@@ -53,7 +53,8 @@ Exit codes:
   2  the command line is wrong
   3  an input is missing, unreadable, too large or cannot be parsed
   4  refused, or something is undecided; nothing was written
-  5  writing or verification failed; DIR is not in place, unless the message says it is
+  5  writing or verification failed; DIR is not in place, unless the message says it
+     is; or the file for --html cannot be written, and then nothing else is
 
 Manual: man schema-migrate)";
 
@@ -78,6 +79,7 @@ class MigrateCommand : public Command {
     migrate->add_option("--format", m_format, "text or json; text unless given")
         ->check(oneOf({"text", "json"}))
         ->type_name("FORMAT");
+    m_html.declare(migrate);
     migrate->add_flag("--allow-foreign-parent", m_options.allowForeignParent,
                       "create DIR also where another user may rename it");
     return migrate;
@@ -86,7 +88,7 @@ class MigrateCommand : public Command {
   int run(Console* console) override {
     m_options.isInLibraryLayout = m_layout == "library";
     m_options.isJson = m_format == "json";
-    migrate(m_planOptions, m_options, console);
+    migrate(m_planOptions, m_options, &m_html, console);
     return kDone;
   }
 
@@ -95,6 +97,7 @@ class MigrateCommand : public Command {
   MigrateOptions m_options;
   std::string m_layout;
   std::string m_format;
+  HtmlOption m_html;
 };
 
 }  // namespace

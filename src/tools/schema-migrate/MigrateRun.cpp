@@ -7,6 +7,7 @@
 #include <utility>
 #include <vector>
 
+#include "HtmlReport.h"
 #include "Interruption.h"
 #include "Messages.h"
 #include "MigrateSummary.h"
@@ -34,15 +35,20 @@ OutputOptions outputOptions(const PlanOptions& planOptions, const MigrateOptions
   return {options.out, inputs, options.allowForeignParent, mask};
 }
 
-void report(const MigrationPlan& plan, const MigrateOptions& options, Console* console) {
-  DifferenceFilter filter;
-  filter.isWithSame = options.isJson;
-  const ShownDifferences shown = shownOf(plan, filter);
+void report(const MigrationPlan& plan, const MigrateOptions& options, HtmlOption* html,
+            Console* console) {
+  DifferenceFilter all;
+  all.isWithSame = true;
+  const std::string document =
+      options.isJson || html->isWanted() ? renderPlanJson(plan, shownOf(plan, all), "migrate") : "";
+  if (html->isWanted()) {
+    html->write(renderPlanHtml(document));
+  }
   if (options.isJson) {
-    console->print(renderPlanJson(plan, shown, "migrate"));
+    console->print(document);
   } else {
     console->printText(renderFindings(plan) +
-                       renderDifferences(plan, shown, {isColourWanted(), false}));
+                       renderDifferences(plan, shownOf(plan, {}), {isColourWanted(), false}));
   }
 }
 
@@ -123,7 +129,9 @@ void summarize(const MigrateOptions& options, const std::string& summary, Consol
 
 }  // namespace
 
-void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Console* console) {
+void migrate(const PlanOptions& planOptions, const MigrateOptions& options, HtmlOption* html,
+             Console* console) {
+  html->open();
   Removals* const removals = interruption::removals();
   std::string warnings;
   OutputDirectory output(outputOptions(planOptions, options), removals, &warnings);
@@ -131,7 +139,7 @@ void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Cons
   const std::unique_ptr<MigrationPlan> plan = planOptions.makePlan();
   warnings = warningsOf(*plan);
   console->complain(&warnings);
-  report(*plan, options, console);
+  report(*plan, options, html, console);
   refuseUnlessReady(*plan);
   std::string summary;
   {

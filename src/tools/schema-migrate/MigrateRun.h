@@ -6,6 +6,7 @@
 #include <string>
 
 #include "Console.h"
+#include "HtmlOption.h"
 #include "PlanOptions.h"
 
 struct MigrateOptions {
@@ -16,7 +17,9 @@ struct MigrateOptions {
   bool isJson = false;
 };
 
-// Puts the migrated schema in place, whole and verified, or throws a Failure.
-void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Console* console);
+// Puts the migrated schema in place, whole and verified, or throws a Failure. The page is written
+// before, whether or not the plan can be carried out.
+void migrate(const PlanOptions& planOptions, const MigrateOptions& options, HtmlOption* html,
+             Console* console);
 
 #endif  // SCHEMA_MIGRATE_MIGRATE_RUN_H

@@ -3,17 +3,16 @@
 #include <libschema-migration/DecisionsTemplate.h>
 
 #include <CLI/CLI.hpp>
-#include <optional>
 
 #include "Command.h"
 #include "CommandLine.h"
+#include "HtmlOption.h"
 #include "HtmlReport.h"
 #include "Messages.h"
 #include "NewFile.h"
 #include "PlanFile.h"
 #include "PlanOptions.h"
 #include "PlanReport.h"
-#include "ReportFile.h"
 #include "Terminal.h"
 
 namespace {
@@ -68,15 +67,12 @@ class PlanCommand : public Command {
     plan->add_option("--format", m_format, "text or json")
         ->check(oneOf({"text", "json"}))
         ->type_name("FORMAT");
-    addHtml(plan, &m_html);
+    m_html.declare(plan);
     return plan;
   }
 
   int run(Console* console) override {
-    std::optional<ReportFile> page;
-    if (!m_html.empty()) {
-      page.emplace(m_html, kHtmlBeginning);
-    }
+    m_html.open();
     if (!m_save.empty()) {
       refuseUnlessPlanCanBeSaved(m_save);
       m_options.makePathsAbsolute();
@@ -92,10 +88,9 @@ class PlanCommand : public Command {
     DifferenceFilter all;
     all.isWithSame = true;
     const std::string document =
-        isJson || page ? renderPlanJson(*plan, shownOf(*plan, all), "plan") : "";
-    if (page) {
-      page->write(renderPlanHtml(document));
-      page->put();
+        isJson || m_html.isWanted() ? renderPlanJson(*plan, shownOf(*plan, all), "plan") : "";
+    if (m_html.isWanted()) {
+      m_html.write(renderPlanHtml(document));
     }
     const PlanStyle style{isColourWanted(), false};
     if (isJson) {
@@ -115,7 +110,7 @@ class PlanCommand : public Command {
   std::string m_template;
   std::string m_save;
   std::string m_format = "text";
-  std::string m_html;
+  HtmlOption m_html;
 };
 
 }  // namespace

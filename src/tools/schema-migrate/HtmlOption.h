@@ -1,0 +1,30 @@
+// --html, which several commands have.
+
+#ifndef SCHEMA_MIGRATE_HTML_OPTION_H
+#define SCHEMA_MIGRATE_HTML_OPTION_H
+
+#include <CLI/CLI.hpp>
+#include <optional>
+#include <string>
+
+#include "ReportFile.h"
+
+class HtmlOption {
+ public:
+  // Adds it to a command; it refers to this object.
+  void declare(CLI::App* command);
+
+  bool isWanted() const { return !m_path.empty(); }
+
+  // To be called before the work is done: throws a Failure where no page can be written. Does
+  // nothing when none is wanted.
+  void open();
+  // Puts the page in its place, whole; throws a Failure when that cannot be done.
+  void write(const std::string& page);
+
+ private:
+  std::string m_path;
+  std::optional<ReportFile> m_file;
+};
+
+#endif  // SCHEMA_MIGRATE_HTML_OPTION_H
