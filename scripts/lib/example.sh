@@ -15,13 +15,13 @@ migrate_example() {
     --exclude-oids examples/excluded-oids.txt --withdraw examples/withdraw-oids.txt
     --decisions examples/decisions.toml)
   mkdir -p "$folder"
-  shown "$tool" plan "${inputs[@]}" --save "$folder/plan.json" --html "$folder/plan.html"
-  shown "$tool" migrate "${inputs[@]}" --out "$folder/migrated"
+  shown "$tool" plan "${inputs[@]}" --save "$folder/plan.json"
+  shown "$tool" migrate "${inputs[@]}" --out "$folder/migrated" --html "$folder/migrated.html"
   shown "$tool" verify --plan "$folder/plan.json" "$folder/migrated"
   cat <<END
 
 The migrated schema:         $folder/migrated
-The plan, for a browser:     $folder/plan.html
+What came of it, to browse:  $folder/migrated.html
 The plan that was verified:  $folder/plan.json
 What the example shows:      examples/README.md
 An upgrade step by step:     docs/guide.md
