@@ -99,6 +99,8 @@ os.makedirs(FOLDER)
 run("plan", ["plan", *sides(EXAMPLES)], (4,))
 run("unknown", ["plan", *sides(EXAMPLES, with_base=False)], (4,))
 run("diff", ["diff", *sides(EXAMPLES)], (1,))
+run("migrate", ["migrate", *sides(EXAMPLES), "--decisions", os.path.join(EXAMPLES, "decisions.toml"),
+                "--dry-run", "--out", os.path.join(FOLDER, "out")], (0,))
 run("check", ["check", os.path.join(EXAMPLES, "old"), os.path.join(EXAMPLES, "new")], (0, 1))
 
 HOSTILE_FOLDER = os.path.join(FOLDER, "<img src=x onerror=alert(1)>")

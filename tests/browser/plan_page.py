@@ -257,5 +257,24 @@ class DiffPage(PageTest):
         self.assertEqual([], self.all("#same"))
 
 
+class MigratePage(PageTest):
+    page = "migrate"
+
+    def test_is_quiet(self):
+        self.check_is_quiet()
+
+    def test_may_go_ahead(self):
+        self.assertEqual("Migration", self.one("h1").text)
+        self.assertIn("The migration may go ahead", self.one(".verdict.good").text)
+        self.assertEqual("Nothing is undecided.", self.one("#undecided p").text)
+
+    def test_decisions_are_told(self):
+        decided = [d for d in self.document()["definitions"] if d["decision"]]
+        self.assertGreater(len(decided), 2)
+        text = self.script("return document.getElementById('rest').textContent")
+        for definition in decided:
+            self.assertIn(definition["decision"], text)
+
+
 if __name__ == "__main__":
     main()

@@ -1,0 +1,240 @@
+// The three formats of one run say the same: from the JSON document is worked out what the text and
+// the page have to say of each definition.
+
+#include <gtest/gtest.h>
+
+#include <cstddef>
+#include <nlohmann/json.hpp>
+#include <string>
+#include <vector>
+
+#include "Files.h"
+#include "ToolRun.h"
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+std::string spaced(std::string word) {
+  for (char& c : word) {
+    c = c == '-' ? ' ' : c;
+  }
+  return word;
+}
+
+std::string classWord(const Json& definition) {
+  const std::string word = definition["class"];
+  std::string told = word == "changed-by-both-mergeable"     ? "changed by both, mergeable"
+                     : word == "changed-by-both-in-conflict" ? "changed by both, in conflict"
+                                                             : spaced(word);
+  told += definition["renamed"] ? ", renamed" : "";
+  return told + (definition["renumbered"] ? ", renumbered" : "");
+}
+
+bool isSame(const Json& definition) {
+  return definition["outcome"] == "same" || definition["outcome"] == "gone";
+}
+
+std::string shortPlace(const Json& place) {
+  const std::string file = place["file"];
+  return file.substr(file.rfind('/') + 1) + ":" + std::to_string(place["line"].get<int>());
+}
+
+// ---- Text ----
+
+std::string labelled(std::string label, const std::string& value) {
+  label.resize(10, ' ');
+  return "  " + label + value + "\n";
+}
+
+std::string clauseInText(const Json& clause) {
+  std::string text = "  " + clause["clause"].get<std::string>() + "\n";
+  for (const char* const side : {"base", "old", "new", "result"}) {
+    if (clause[side].is_string()) {
+      text += labelled(std::string("  ") + side, clause[side]);
+    }
+  }
+  return text + (clause["decided"] ? "" : labelled("  result", "undecided"));
+}
+
+// What the text says of a definition, every line of it.
+std::string inText(const Json& definition) {
+  const std::string oid = definition["oid"];
+  const std::string kind = definition["kind"];
+  std::string text =
+      spaced(kind) + " " +
+      (kind == "vendor-extension" ? oid : definition["name"].get<std::string>() + " (" + oid + ")");
+  text += ": " + classWord(definition) + " -> " + definition["outcome"].get<std::string>();
+  const std::string risk = definition["risk"];
+  text += (risk == "none" ? "" : " [" + risk + "]") + "\n";
+  text += "  " + definition["reason"].get<std::string>() + "\n";
+  std::string places;
+  const Json& all = definition["places"];
+  for (const auto& [name, side] : std::vector<std::pair<std::string, std::string>>{
+           {"BASE", "base"}, {"OLD", "old"}, {"NEW", "new"}}) {
+    if (!all[side].is_null()) {
+      places += (places.empty() ? "" : ", ") + name + " " + shortPlace(all[side]);
+    }
+  }
+  text += "  " + places + "\n";
+  for (const Json& clause : definition["clauses"]) {
+    text += clauseInText(clause);
+  }
+  for (const Json& note : definition["notes"]) {
+    text += labelled("note", note);
+  }
+  return text +
+         (definition["decision"].is_null() ? "" : labelled("decided", definition["decision"]));
+}
+
+// ---- HTML ----
+
+std::string replaced(std::string text, const std::string& from, const std::string& to) {
+  for (std::size_t at = 0; (at = text.find(from, at)) != std::string::npos; at += to.size()) {
+    text.replace(at, from.size(), to);
+  }
+  return text;
+}
+
+// The text of a part of a page, without its elements.
+std::string textOf(const std::string& html) {
+  std::string text;
+  bool isInTag = false;
+  for (const char c : html) {
+    isInTag = isInTag || c == '<';
+    text += isInTag ? "" : std::string(1, c);
+    isInTag = isInTag && c != '>';
+  }
+  for (const auto& [escaped, plain] : std::vector<std::pair<std::string, std::string>>{
+           {"&lt;", "<"}, {"&gt;", ">"}, {"&quot;", "\""}, {"&#39;", "'"}, {"&amp;", "&"}}) {
+    text = replaced(text, escaped, plain);
+  }
+  return text;
+}
+
+// The element with the identifier "d" and the number, up to the end of one of its sort.
+std::string definitionIn(const std::string& page, std::size_t number, const std::string& element) {
+  const std::size_t begin = page.find(" id=\"d" + std::to_string(number) + "\"");
+  const std::size_t end = page.find("</" + element + ">", begin);
+  return begin == std::string::npos ? "" : page.substr(page.find('>', begin) + 1, end - begin);
+}
+
+// What the page says of a definition, in this order.
+std::vector<std::string> inPage(const Json& definition) {
+  std::vector<std::string> told = {spaced(definition["kind"]) + " " +
+                                   definition["name"].get<std::string>() + " (" +
+                                   definition["oid"].get<std::string>() + ")"};
+  told.push_back(classWord(definition) + " \u2192 " + definition["outcome"].get<std::string>());
+  if (definition["risk"] != "none") {
+    told.push_back("risk: " + definition["risk"].get<std::string>());
+  }
+  told.push_back(definition["reason"]);
+  for (const auto& [name, side] : std::vector<std::pair<std::string, std::string>>{
+           {"Old", "old"}, {"New", "new"}, {"Result", "result"}}) {
+    const Json& place = definition["places"][side];
+    told.push_back(name + " " + (place.is_null() ? "not there" : shortPlace(place)));
+  }
+  for (const Json& clause : definition["clauses"]) {
+    told.push_back("\u2260 " + clause["clause"].get<std::string>());
+    for (const char* const side : {"base", "old", "new", "result"}) {
+      if (clause[side].is_string()) {
+        told.push_back(clause[side]);
+      }
+    }
+    if (!clause["decided"]) {
+      told.emplace_back("? undecided");
+    }
+  }
+  for (const Json& other : definition["otherClauses"]) {
+    told.push_back(other["clause"]);
+    if (other["clause"] != other["value"]) {
+      told.push_back(other["value"]);
+    }
+  }
+  for (const Json& note : definition["notes"]) {
+    told.push_back(note);
+  }
+  if (!definition["decision"].is_null()) {
+    told.push_back(definition["decision"]);
+  }
+  return told;
+}
+
+void expectInOrder(const std::vector<std::string>& parts, const std::string& text) {
+  std::size_t at = 0;
+  for (const std::string& part : parts) {
+    const std::size_t found = text.find(part, at);
+    EXPECT_NE(std::string::npos, found) << part << "\nis not in its place in\n" << text;
+    at = found == std::string::npos ? at : found + part.size();
+  }
+}
+
+// ---- The runs ----
+
+struct Run {
+  const char* name;
+  std::vector<std::string> arguments;
+};
+
+void PrintTo(const Run& run, std::ostream* out) { *out << run.name; }
+
+class Formats : public ::testing::TestWithParam<Run> {};
+
+TEST_P(Formats, SayTheSame) {
+  const ToolFolder folder;
+  std::vector<std::string> arguments = GetParam().arguments;
+  arguments.insert(arguments.end(), {"--from", EXAMPLES "/old", "--to", EXAMPLES "/new"});
+  const std::string text = "\n" + folder.run(arguments).out;
+  arguments.insert(arguments.end(), {"--format", "json", "--html", "@/page.html"});
+  const Json document = Json::parse(folder.run(arguments).out);
+  const std::string page = folder.withoutPath(support::readWholeFile(folder.file("page.html")));
+  const std::string pageText = textOf(page);
+  std::size_t differences = 0;
+  for (std::size_t i = 0; i < document["definitions"].size(); ++i) {
+    const Json& definition = document["definitions"][i];
+    if (isSame(definition)) {
+      EXPECT_NE("", definitionIn(page, i, "p"));
+      continue;
+    }
+    ++differences;
+    EXPECT_NE(std::string::npos, text.find("\n" + inText(definition) + "\n"))
+        << inText(definition) << "is not in\n"
+        << text;
+    expectInOrder(inPage(definition), textOf(definitionIn(page, i, "article")));
+  }
+  EXPECT_GT(differences, 20U);
+  EXPECT_NE(std::string::npos,
+            text.find(std::to_string(differences) + " differences in " +
+                      std::to_string(document["counts"]["definitions"].get<std::size_t>()) +
+                      " definitions"));
+  for (const char* const findings : {"findings", "newInResult"}) {
+    for (const Json& finding : document[findings]) {
+      EXPECT_NE(std::string::npos, pageText.find(finding["text"].get<std::string>()));
+    }
+  }
+  for (const Json& finding : document["findings"]) {
+    const bool isPlan = document["command"] != "diff";
+    EXPECT_EQ(isPlan, text.find(finding["text"].get<std::string>()) != std::string::npos);
+  }
+  for (const Json& refusal : document["refusals"]) {
+    EXPECT_NE(std::string::npos, pageText.find(refusal["text"].get<std::string>()));
+  }
+  EXPECT_EQ(document["ready"].get<bool>(),
+            page.find("The migration may go ahead") != std::string::npos);
+}
+
+INSTANTIATE_TEST_SUITE_P(Runs, Formats,
+                         ::testing::Values(Run{"Diff", {"diff", "--base", EXAMPLES "/base"}},
+                                           Run{"DiffWithoutBase", {"diff"}},
+                                           Run{"Plan", {"plan", "--base", EXAMPLES "/base"}},
+                                           Run{"PlanWithDecisions",
+                                               {"plan", "--base", EXAMPLES "/base", "--decisions",
+                                                EXAMPLES "/decisions.toml"}},
+                                           Run{"PlanWithoutBase", {"plan", "--prefer", "old"}},
+                                           Run{"Migrate",
+                                               {"migrate", "--dry-run", "--out", "@/out", "--base",
+                                                EXAMPLES "/base", "--decisions",
+                                                EXAMPLES "/decisions.toml"}}),
+                         [](const auto& row) { return row.param.name; });
+
+}  // namespace
