@@ -5,7 +5,7 @@ option(LIBSCHEMA_REFERENCE "Make the reference of both libraries (Doxygen)" OFF)
 
 install(FILES README.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
 install(DIRECTORY docs/ DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation
-        FILES_MATCHING PATTERN "*.md" PATTERN "*.schema.json" PATTERN "reference" EXCLUDE)
+        FILES_MATCHING PATTERN "*.md" PATTERN "*.schema.json" PATTERN "reference" EXCLUDE PATTERN "man" EXCLUDE)
 install(DIRECTORY examples DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
 
 # configure_reference(<folder> <variable>): the variable names a settings file by which Doxygen makes the
