@@ -16,7 +16,7 @@ marked() {
 missing() {
   local report line
   report=$(hardening-check "$1" || true)
-  grep -q 'Immediate binding: yes' <<<"$report" || expect "report on $1" "a report" "$report"
+  grep -q 'Immediate binding: yes' <<<"$report" || printf 'no immediate binding: %s\n' "$report"
   for line in "${@:2}"; do
     report=$(grep -v "^ $line" <<<"$report" || true)
   done
@@ -34,11 +34,14 @@ case $(uname -m) in
     ;;
   *) ignored+=("Control flow integrity:") ;;
 esac
-expect "what the tool misses" "" "$(missing "$PREFIX/bin/schema-migrate" "${ignored[@]}")"
+# clang makes a checked call of none of the functions that the tool takes from the C library.
+unchecked="Fortify Source functions: no, only unprotected"
+of_tool=("${ignored[@]}")
+! "$CXX" --version | grep -q clang || of_tool+=("$unchecked")
+expect "what the tool misses" "" "$(missing "$PREFIX/bin/schema-migrate" "${of_tool[@]}")"
 ignored+=("Position Independent Executable: no, regular shared library")
 for library in libschema-platform.so libschema-migration.so; do
   expect "what $library misses" "" "$(missing "$lib/$library" "${ignored[@]}")"
 done
-# The C library's functions that libschema calls get areas of a size that is known when it runs only.
-expect "what libschema.so misses" "" \
-  "$(missing "$lib/libschema.so" "${ignored[@]}" "Fortify Source functions: no, only unprotected")"
+# Nor does any compiler of those that libschema does.
+expect "what libschema.so misses" "" "$(missing "$lib/libschema.so" "${ignored[@]}" "$unchecked")"
