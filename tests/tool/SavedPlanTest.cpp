@@ -1,4 +1,5 @@
-// plan --save: what a saved plan holds, and that it is there whole or not at all.
+// plan --save: what a saved plan holds, and that it is there whole or not at all. migrate --plan:
+// that it is carried out as long as it holds, and no longer.
 
 #include <gtest/gtest.h>
 #include <sys/resource.h>
@@ -64,8 +65,8 @@ TEST_F(SavedPlan, IsTheSameEachTime) {
 }
 
 TEST_F(SavedPlan, HoldsTheSha256OfEveryInputListAndDecisionsFile) {
-  m_folder.write("excluded", "7.7\n");
-  m_folder.write("withdrawn", "7.8\n");
+  m_folder.write("excluded", "# none\n");
+  m_folder.write("withdrawn", "# none\n");
   m_folder.write("decisions.toml", "# none\n");
   const json plan = save({"--exclude-oids", "@/excluded", "--withdraw", "@/withdrawn",
                           "--decisions", "@/decisions.toml"});
@@ -91,9 +92,9 @@ TEST_F(SavedPlan, HoldsEveryOptionThatMatters) {
       "excludeOids": [], "withdraw": null, "decisions": [], "prefer": null, "acceptBase": false,
       "allowUnused": false})")),
             plain);
-  m_folder.write("e1", "7.7\n");
-  m_folder.write("e2", "7.8\n");
-  m_folder.write("w", "7.9\n");
+  m_folder.write("e1", "# none\n");
+  m_folder.write("e2", "# none\n");
+  m_folder.write("w", "# none\n");
   m_folder.write("d.toml",
                  "[[definition]]\nkind = \"object-class\"\nname = \"nowhere\"\n"
                  "take = \"new\"\n");
@@ -263,6 +264,213 @@ TEST_F(SavedPlan, IsWholeOrNotThereWheneverTheRunIsKilled) {
   }
   EXPECT_GT(changes, 4);
   EXPECT_GT(withOther, 4);
+}
+
+// ---- migrate --plan ----
+
+class MigrateByPlan : public SavedPlan {
+ protected:
+  MigrateByPlan() {
+    m_folder.write("excluded", "# none\n");
+    m_folder.write("withdrawn", "# none\n");
+    m_folder.write("decisions.toml",
+                   "[[definition]]\nkind = \"attribute-type\"\nname = \"b\"\ntake = \"old\"\n");
+    save({"--exclude-oids", "@/excluded", "--withdraw", "@/withdrawn", "--decisions",
+          "@/decisions.toml"});
+  }
+
+  ToolResult migrate(const std::vector<std::string>& more = {}) const {
+    std::vector<std::string> arguments = {"migrate", "--plan", "@/plan.json", "--out", "@/out"};
+    arguments.insert(arguments.end(), more.begin(), more.end());
+    return m_folder.run(arguments);
+  }
+  void edit(const std::string& file, const std::string& from, const std::string& to) const {
+    m_folder.write(file, replaced(support::readWholeFile(m_folder.file(file)), from, to));
+  }
+  // Refused with this line among those told, and nothing written.
+  void expectRefused(const std::string& line) const {
+    const std::string before = m_folder.snapshot();
+    const ToolResult result = migrate();
+    EXPECT_EQ(4, result.exitCode) << result.err;
+    EXPECT_NE(std::string::npos, result.err.find(line)) << line << "\n" << result.err;
+    EXPECT_NE(
+        std::string::npos,
+        result.err.find("schema-migrate: error: refused: the plan does not hold any more, and "
+                        "nothing was written; make it again with plan --save\n"))
+        << result.err;
+    EXPECT_EQ("", result.out);
+    EXPECT_EQ(before, m_folder.snapshot());
+  }
+};
+
+TEST_F(MigrateByPlan, DoesWhatItsOptionsDo) {
+  for (const char* const layout : {"keep", "library"}) {
+    const ToolResult byPlan = migrate({"--layout", layout});
+    EXPECT_EQ("", byPlan.err);
+    EXPECT_EQ(0, byPlan.exitCode);
+    const ToolFolder::Files files = m_folder.contents("out");
+    std::filesystem::remove_all(m_folder.file("out"));
+    const ToolResult byOptions = m_folder.runPlanned(
+        "migrate", {"--exclude-oids", "@/excluded", "--withdraw", "@/withdrawn", "--decisions",
+                    "@/decisions.toml", "--out", "@/out", "--layout", layout});
+    EXPECT_EQ(byOptions.out, byPlan.out);
+    EXPECT_EQ(m_folder.contents("out"), files);
+    EXPECT_NE(std::string::npos, files.at("V3.system.at").find("'b' DESC 'd'") +
+                                     files.at("V3.system.at").find("'b'  )  DESC 'd'") + 1);
+    std::filesystem::remove_all(m_folder.file("out"));
+  }
+}
+
+TEST_F(MigrateByPlan, IsCarriedOutFromAnotherDirectory) {
+  std::filesystem::create_directory(m_folder.file("elsewhere"));
+  ASSERT_EQ(0, m_folder
+                   .run({"plan", "--base", "base", "--from", "old", "--to", "new", "--save", "p"},
+                        [&] { static_cast<void>(::chdir(m_folder.path().c_str())); })
+                   .exitCode);
+  const ToolResult result = m_folder.run({"migrate", "--plan", "../p", "--out", "out"}, [&] {
+    static_cast<void>(::chdir(m_folder.file("elsewhere").c_str()));
+  });
+  EXPECT_EQ("", result.err);
+  EXPECT_EQ(0, result.exitCode);
+  EXPECT_EQ(5U, m_folder.contents("elsewhere/out").size());
+}
+
+// What --format json prints is a plan, too.
+TEST_F(MigrateByPlan, TakesThePrintedDocument) {
+  const ToolResult printed = m_folder.runPlanned("plan", {"--format", "json"});
+  m_folder.write("plan.json", m_folder.withPath(printed.out));
+  EXPECT_EQ(0, migrate().exitCode);
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenAnInputChanged) {
+  edit("old/V3.user.at", "'s'", "'s' DESC 'more'");
+  expectRefused(
+      "@/old/V3.user.at: error: is not what the plan was made from (old): its SHA-256 was ");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenAListChanged) {
+  m_folder.write("excluded", "# more\n");
+  expectRefused("@/excluded: error: is not what the plan was made from (exclude): ");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenTheWithdrawalsChanged) {
+  m_folder.write("withdrawn", "");
+  expectRefused("@/withdrawn: error: is not what the plan was made from (withdraw): ");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenADecisionChanged) {
+  edit("decisions.toml", "old", "new");
+  expectRefused("@/decisions.toml: error: is not what the plan was made from (decisions): ");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenAnInputIsMalformedNow) {
+  m_folder.write("decisions.toml", "[[definition\n");
+  expectRefused("@/decisions.toml: error: is not what the plan was made from (decisions): ");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenAFileIsGone) {
+  std::filesystem::remove(m_folder.file("base/V3.system.oc"));
+  expectRefused(
+      "@/base/V3.system.oc: error: the plan was made from it (base), and it is no longer "
+      "there\n");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenAListIsGone) {
+  std::filesystem::remove(m_folder.file("excluded"));
+  expectRefused(
+      "@/excluded: error: the plan was made from it (exclude), and it cannot be read any more: No "
+      "such file or directory\n");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenADirectoryIsGone) {
+  std::filesystem::rename(m_folder.file("base"), m_folder.file("moved"));
+  expectRefused(
+      "@/base/V3.system.at: error: the plan was made from it (base), and it is no longer "
+      "there\n");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenAFileIsNew) {
+  m_folder.write("new/V3.orv.oc", "");
+  expectRefused("@/new/V3.orv.oc: error: is new: the plan was made without it (new)\n");
+}
+
+TEST_F(MigrateByPlan, IsRefusedByAnotherVersion) {
+  edit("plan.json", "\"version\": \"" SCHEMA_MIGRATE_VERSION "\"", "\"version\": \"0.9.9\"");
+  expectRefused(
+      "@/plan.json: error: was made by version 0.9.9 of the program, and this is " SCHEMA_MIGRATE_VERSION
+      "\n");
+}
+
+// Whoever changes an outcome in it changes nothing of what its inputs give.
+TEST_F(MigrateByPlan, IsRefusedWhenItWasChanged) {
+  edit("plan.json", "\"outcome\": \"added\"", "\"outcome\": \"dropped\"");
+  expectRefused(
+      "@/plan.json: error: attribute-type s (9.1): outcome is dropped in the plan, and its "
+      "inputs give added\n");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhenAnOptionWasChanged) {
+  edit("plan.json", "\"prefer\": null", "\"prefer\": \"old\"");
+  edit("plan.json", "\"ready\": true", "\"ready\": false");
+  expectRefused("@/plan.json: error: \"ready\" is not what the inputs of the plan give\n");
+}
+
+TEST_F(MigrateByPlan, IsRefusedWhileItIsNotReady) {
+  ASSERT_EQ(
+      4,
+      m_folder.run({"plan", "--from", "@/old", "--to", "@/new", "--save", "@/plan.json"}).exitCode);
+  const ToolResult result = migrate();
+  EXPECT_EQ(4, result.exitCode);
+  EXPECT_NE(std::string::npos, result.err.find("undecided: object class c (2.1)")) << result.err;
+  EXPECT_FALSE(std::filesystem::exists(m_folder.file("out")));
+}
+
+TEST_F(MigrateByPlan, ContradictionsAreErrorsOfUsage) {
+  const std::vector<std::string> options[] = {
+      {"--from", "@/old"},    {"--to", "@/new"},         {"--base", "@/base"},
+      {"--accept-base"},      {"--exclude-oids", "@/e"}, {"--withdraw", "@/w"},
+      {"--decisions", "@/d"}, {"--allow-unused"},        {"--prefer", "old"},
+  };
+  for (const std::vector<std::string>& option : options) {
+    const ToolResult result = migrate(option);
+    EXPECT_EQ(2, result.exitCode) << option.front();
+    EXPECT_NE(std::string::npos, result.err.find("--plan")) << result.err;
+    EXPECT_NE(std::string::npos, result.err.find(option.front())) << result.err;
+  }
+  const ToolResult nothing = m_folder.run({"migrate", "--out", "@/out"});
+  EXPECT_EQ(2, nothing.exitCode);
+  EXPECT_EQ(
+      "schema-migrate: error: --from is required, or --plan; schema-migrate migrate --help "
+      "tells how it is used\n",
+      nothing.err);
+  const ToolResult half = m_folder.run({"migrate", "--from", "@/old", "--out", "@/out"});
+  EXPECT_EQ(2, half.exitCode);
+  EXPECT_EQ(
+      "schema-migrate: error: --to is required, or --plan; schema-migrate migrate --help "
+      "tells how it is used\n",
+      half.err);
+}
+
+TEST_F(MigrateByPlan, AMalformedPlanIsToldWithItsPlace) {
+  edit("plan.json", "\"options\": {", "\"options\": {,");
+  const ToolResult cut = migrate();
+  EXPECT_EQ(3, cut.exitCode);
+  EXPECT_EQ("@/plan.json:9:15: error: is no saved plan: the JSON text is wrong or ends here\n",
+            cut.err);
+  m_folder.write("plan.json", "{}");
+  EXPECT_EQ(3, migrate().exitCode);
+  std::filesystem::remove(m_folder.file("plan.json"));
+  const ToolResult gone = migrate();
+  EXPECT_EQ(3, gone.exitCode);
+  EXPECT_EQ("@/plan.json: error: cannot be read: No such file or directory\n", gone.err);
+}
+
+// The output must not lie in what the plan reads.
+TEST_F(MigrateByPlan, TheOutputLiesOutsideTheInputs) {
+  const ToolResult result =
+      m_folder.run({"migrate", "--plan", "@/plan.json", "--out", "@/base/out"});
+  EXPECT_EQ(2, result.exitCode);
+  EXPECT_NE(std::string::npos, result.err.find("lies inside @/base")) << result.err;
 }
 
 }  // namespace

@@ -224,8 +224,8 @@ TEST_F(Verify, APlanThatHoldsNoLongerIsTold) {
   const ToolResult result = verify();
   EXPECT_EQ("", result.err);
   EXPECT_EQ(1, result.exitCode);
-  EXPECT_EQ(0U, result.out.find("@/base/V3.system.oc: the plan was made from it, and it is no "
-                                "longer there (base)\n"
+  EXPECT_EQ(0U, result.out.find("@/base/V3.system.oc: the plan was made from it (base), and it is "
+                                "no longer there\n"
                                 "@/old/V3.user.at: is not what the plan was made from (old): its "
                                 "SHA-256 was "))
       << result.out;

@@ -5,6 +5,8 @@
 #define SCHEMA_MIGRATE_COMMAND_H
 
 #include <memory>
+#include <string>
+#include <vector>
 
 #include "Console.h"
 
@@ -21,6 +23,9 @@ class Command {
 
   // Adds the subcommand with its options, which refer to this object, and returns it.
   virtual CLI::App* declare(CLI::App* program) = 0;
+
+  // The words of the command line, the program's name first, for a command that tells them.
+  virtual void takeWords(const std::vector<std::string>& /*words*/) {}
 
   // Returns the exit code, or throws a Failure.
   virtual int run(Console* console) = 0;

@@ -127,7 +127,11 @@ class Program {
     }
     try {
       m_program.parse(argc, argv);
-      return chosen()->second;
+      Command* const command = chosen()->second;
+      std::vector<std::string> words = {m_program.get_name()};
+      words.insert(words.end(), argv + 1, argv + argc);
+      command->takeWords(words);
+      return command;
     } catch (const CLI::Success& printed) {
       *exitCode = m_program.exit(printed);
     } catch (const CLI::ParseError& error) {

@@ -16,6 +16,7 @@
 #include "PrivatePlace.h"
 #include "Progress.h"
 #include "RunPlaces.h"
+#include "RunTime.h"
 #include "Terminal.h"
 #include "TextOutput.h"
 
@@ -32,7 +33,20 @@ OutputOptions outputOptions(const PlanOptions& planOptions, const MigrateOptions
   if (!planOptions.request.base.empty()) {
     inputs.push_back(planOptions.request.base);
   }
-  return {options.out, inputs, options.allowForeignParent, mask};
+  OutputOptions place;
+  place.path = options.out;
+  place.inputs = inputs;
+  place.allowForeignParent = options.allowForeignParent;
+  place.mask = mask;
+  return place;
+}
+
+OutputOptions recordPlace(const PlanOptions& planOptions, const MigrateOptions& options) {
+  OutputOptions place = outputOptions(planOptions, options);
+  place.path = options.record.path;
+  place.option = "--record";
+  place.noun = "record";
+  return place;
 }
 
 void report(const MigrationPlan& plan, const MigrateOptions& options, HtmlOption* html,
@@ -61,16 +75,6 @@ void refuseUnlessReady(const MigrationPlan& plan) {
               "can be decided";
     throw Failure(kRefused, whyNotReady(plan) + errorLine(advice));
   }
-}
-
-std::string linesOf(const migration::Failures& failures) {
-  std::string lines;
-  for (const migration::Failure& failure : failures) {
-    lines += failure.line == 0
-                 ? errorLine(failure.file, failure.text)
-                 : errorLine(placeOf(failure.file, {failure.line, failure.column}), failure.text);
-  }
-  return lines;
 }
 
 // The result in the layout that is wanted, as the library came to it.
@@ -127,14 +131,39 @@ void summarize(const MigrateOptions& options, const std::string& summary, Consol
   }
 }
 
+// The output first: a record of what was not written would mislead.
+void publishBoth(const MigrateOptions& options, OutputDirectory* output, OutputDirectory* record) {
+  try {
+    output->publish();
+    if (record != nullptr) {
+      record->publish();
+    }
+  } catch (const Failure& failure) {
+    if (record == nullptr || record->isPublished()) {
+      throw;
+    }
+    const std::string state =
+        output->isPublished()
+            ? errorLine(options.out, "is complete and in place, but the record of this run is not")
+            : errorLine(options.record.path, "the record was not written either");
+    throw Failure(kNotWritten, failure.what() + state);
+  }
+}
+
 }  // namespace
 
 void migrate(const PlanOptions& planOptions, const MigrateOptions& options, HtmlOption* html,
              Console* console) {
+  static_cast<void>(timeWanted());
   html->open();
   Removals* const removals = interruption::removals();
   std::string warnings;
   OutputDirectory output(outputOptions(planOptions, options), removals, &warnings);
+  std::optional<OutputDirectory> record;
+  if (!options.record.path.empty()) {
+    refuseUnlessApart(options.record.path, options.out);
+    record.emplace(recordPlace(planOptions, options), removals, &warnings);
+  }
   console->complain(&warnings);
   const std::unique_ptr<MigrationPlan> plan = planOptions.makePlan();
   warnings = warningsOf(*plan);
@@ -149,6 +178,11 @@ void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Html
     std::vector<NamedText> texts = execute(*plan, options.isInLibraryLayout, &place);
     summary = "\n" + summaryOf(*plan, texts, options.isInLibraryLayout);
     progress::step("writing and verifying");
+    if (record) {
+      writeRecord(
+          recordRequest(*plan, texts, options.out, options.record, options.isInLibraryLayout),
+          &*record);
+    }
     writeTexts(outputTexts(*plan, std::move(texts)), &output);
   }
   const std::string shownOut = wholePrintable(options.out);
@@ -158,6 +192,10 @@ void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Html
               console);
     return;
   }
-  output.publish();
-  summarize(options, summary + "Written and verified: " + shownOut + "\n", console);
+  publishBoth(options, &output, record ? &*record : nullptr);
+  summary += "Written and verified: " + shownOut + "\n";
+  if (record) {
+    summary += "Recorded: " + wholePrintable(options.record.path) + "\n";
+  }
+  summarize(options, summary, console);
 }

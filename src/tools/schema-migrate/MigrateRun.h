@@ -8,6 +8,7 @@
 #include "Console.h"
 #include "HtmlOption.h"
 #include "PlanOptions.h"
+#include "RecordOutput.h"
 
 struct MigrateOptions {
   std::string out;  // the directory to create
@@ -15,6 +16,7 @@ struct MigrateOptions {
   bool isInLibraryLayout = false;  // as the library writes, not in NEW's own layout
   bool isDryRun = false;           // everything but the publishing
   bool isJson = false;
+  RecordOptions record;
 };
 
 // Puts the migrated schema in place, whole and verified, or throws a Failure. The page is written

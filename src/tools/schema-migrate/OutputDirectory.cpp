@@ -24,21 +24,44 @@ namespace {
 
 OutputDirectory::OutputDirectory(const OutputOptions& options, Removals* removals,
                                  std::string* warnings)
-    : m_place(options, warnings), m_mask(options.mask), m_removals(removals) {}
+    : m_place(options, warnings),
+      m_mask(options.mask),
+      m_removals(removals),
+      m_noun(options.noun) {}
 
 void OutputDirectory::create() {
   const std::string problem =
       m_own.makeUnique(m_place.parent(), m_place.partialPrefix(), m_removals);
   if (!problem.empty()) {
     fail(m_place.path(),
-         "the output directory cannot be created in " + m_place.parent().path() + ": " + problem);
+         "the " + m_noun + " cannot be created in " + m_place.parent().path() + ": " + problem);
   }
   m_own.setPlace(m_place.name());
 }
 
+// What is in it goes with the directory.
+void OutputDirectory::makeFolder(const std::string& name) {
+  const std::string path = directory().pathOf(name);
+  if (::mkdirat(directory().number(), name.c_str(), 0700) != 0) {
+    failSystem(path, "cannot be created");
+  }
+  Directory folder = directory().open(name);
+  if (!folder.isOpen()) {
+    failSystem(path, "cannot be opened");
+  }
+  m_folders.emplace(name, std::move(folder));
+}
+
+const Directory& OutputDirectory::folder(const std::string& name) const {
+  return name.empty() ? directory() : m_folders.at(name);
+}
+
 void OutputDirectory::write(const OutputText& text) {
-  const std::string path = directory().pathOf(text.name);
-  Descriptor file = m_own.createFile(text.name, text.mode ? 0600 : 0666);
+  const Directory& parent = folder(text.folder);
+  const std::string path = parent.pathOf(text.name);
+  Descriptor file(::openat(parent.number(), text.name.c_str(),
+                           O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC,
+                           text.mode ? 0600 : 0666));
   if (!file.isOpen()) {
     failSystem(path, "cannot be created");
   }
@@ -48,7 +71,7 @@ void OutputDirectory::write(const OutputText& text) {
   if (text.mode && ::fchmod(file.number(), *text.mode) != 0) {
     failSystem(path, "its mode cannot be set");
   }
-  m_files.push_back({text.name, std::move(file)});
+  m_files.push_back({path, std::move(file)});
 }
 
 // All are on their way before the first is waited for, so that they go to the disk together.
@@ -58,7 +81,7 @@ void OutputDirectory::sync() {
   }
   for (const Written& written : m_files) {
     if (::fsync(written.file.number()) != 0) {
-      failSystem(directory().pathOf(written.name), "cannot be brought to the disk");
+      failSystem(written.path, "cannot be brought to the disk");
     }
     // What is read back then comes from the disk. Not every file system does so, and none has to.
     static_cast<void>(::posix_fadvise(written.file.number(), 0, 0, POSIX_FADV_DONTNEED));
@@ -87,6 +110,11 @@ void OutputDirectory::giveAttributes() {
 
 void OutputDirectory::publish() {
   giveAttributes();
+  for (const auto& [name, folder] : m_folders) {
+    if (::fchmod(folder.number(), 0777 & ~m_mask) != 0 || ::fsync(folder.number()) != 0) {
+      failSystem(folder.path(), "cannot be brought to the disk");
+    }
+  }
   if (::fsync(directory().number()) != 0) {
     failSystem(directory().path(), "cannot be brought to the disk");
   }
@@ -108,6 +136,7 @@ void OutputDirectory::publish() {
         "something else was put in the place of this run's directory while it was renamed; nothing was published, and what is there is not the output of this run");
   }
   m_own.keep();
+  m_isPublished = true;
   if (::fsync(m_place.parent().number()) != 0) {
     failSystem(m_place.path(),
                "is complete and in place, but its entry cannot be brought to the disk");

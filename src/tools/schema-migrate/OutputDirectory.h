@@ -5,6 +5,7 @@
 #ifndef SCHEMA_MIGRATE_OUTPUT_DIRECTORY_H
 #define SCHEMA_MIGRATE_OUTPUT_DIRECTORY_H
 
+#include <map>
 #include <optional>
 #include <string>
 #include <vector>
@@ -17,6 +18,7 @@ struct OutputText {
   std::string name;
   std::string bytes;
   std::optional<mode_t> mode;  // that of any new file without
+  std::string folder{};        // in the output; empty for the output itself
 };
 
 class OutputDirectory {
@@ -31,7 +33,12 @@ class OutputDirectory {
 
   const Directory& directory() const { return m_own.directory(); }
 
-  // Creates a file in it.
+  // Makes a directory in it.
+  void makeFolder(const std::string& name);
+  // One that was made; with an empty name the directory itself.
+  const Directory& folder(const std::string& name) const;
+
+  // Creates a file in it, or in one of its folders.
   void write(const OutputText& text);
 
   // Brings every file in it to the disk, and out of the memory that reading back would come from.
@@ -42,6 +49,9 @@ class OutputDirectory {
   // nothing published, when another directory was put in the place of this one.
   void publish();
 
+  // Whether it is in its place, whole, whatever publish() came to.
+  bool isPublished() const { return m_isPublished; }
+
  private:
   void giveAttributes();
   void rename();
@@ -50,9 +60,12 @@ class OutputDirectory {
   OutputPlace m_place;
   mode_t m_mask;
   Removals* m_removals;
+  std::string m_noun;
   OwnDirectory m_own;
+  bool m_isPublished = false;
+  std::map<std::string, Directory> m_folders;
   struct Written {
-    std::string name;
+    std::string path;
     Descriptor file;
   };
   std::vector<Written> m_files;

@@ -8,18 +8,10 @@
 
 #include "Messages.h"
 #include "NewFile.h"
+#include "PlanReport.h"
+#include "Progress.h"
 
 namespace {
-
-std::string linesOf(const migration::Failures& failures) {
-  std::string lines;
-  for (const migration::Failure& failure : failures) {
-    lines += failure.line == 0
-                 ? errorLine(failure.file, failure.text)
-                 : errorLine(placeOf(failure.file, {failure.line, failure.column}), failure.text);
-  }
-  return lines;
-}
 
 std::unique_ptr<migration::Source> readPlanFile(const std::string& path,
                                                 migration::Failures* failures) {
@@ -60,20 +52,29 @@ void savePlan(const migration::MigrationPlan& plan, const std::string& path) {
   writeNewFile(path, migration::planDocument(plan, {"plan", SCHEMA_MIGRATE_VERSION}), over);
 }
 
-RemadePlan remakePlan(const std::string& path, std::uint64_t limit) {
-  RemadePlan remade;
+LoadedPlan loadPlan(const std::string& path) {
+  LoadedPlan loaded;
   migration::Failures failures;
-  remade.source = readPlanFile(path, &failures);
+  loaded.source = readPlanFile(path, &failures);
   std::optional<migration::SavedPlan> saved;
-  if (remade.source != nullptr) {
-    saved = migration::readSavedPlan(*remade.source, &failures);
+  if (loaded.source != nullptr) {
+    saved = migration::readSavedPlan(*loaded.source, &failures);
   }
   if (!saved) {
     throw Failure(kBadInput, linesOf(failures));
   }
-  remade.saved = std::move(*saved);
-  remade.saved.request.limits.bytes = limit;
-  remade.again = migration::makePlan(remade.saved.request);
-  remade.changes = migration::changesSince(remade.saved, *remade.again, SCHEMA_MIGRATE_VERSION);
+  loaded.saved = std::move(*saved);
+  return loaded;
+}
+
+RemadePlan remakePlan(const std::string& path, const migration::ReadLimits& limits) {
+  RemadePlan remade;
+  remade.loaded = loadPlan(path);
+  migration::PlanRequest request = remade.loaded.saved.request;
+  request.limits = limits;
+  request.onStep = progress::step;
+  remade.again = migration::makePlan(request);
+  remade.changes =
+      migration::changesSince(remade.loaded.saved, *remade.again, SCHEMA_MIGRATE_VERSION);
   return remade;
 }

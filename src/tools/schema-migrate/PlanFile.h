@@ -6,7 +6,6 @@
 #include <libschema-migration/MigrationPlan.h>
 #include <libschema-migration/SavedPlan.h>
 
-#include <cstdint>
 #include <memory>
 #include <string>
 
@@ -17,16 +16,23 @@ void refuseUnlessPlanCanBeSaved(const std::string& path);
 // Saves it, whole or not at all. Throws a Failure when that cannot be done.
 void savePlan(const migration::MigrationPlan& plan, const std::string& path);
 
-// A plan that was read and made again.
-struct RemadePlan {
+// A plan that was read.
+struct LoadedPlan {
   std::unique_ptr<migration::Source> source;
   migration::SavedPlan saved;
+};
+
+// Throws a Failure when `path` cannot be read or is no saved plan.
+LoadedPlan loadPlan(const std::string& path);
+
+// And made again.
+struct RemadePlan {
+  LoadedPlan loaded;
   std::unique_ptr<migration::MigrationPlan> again;
   migration::Failures changes;  // what of it holds no longer
 };
 
-// Throws a Failure when `path` cannot be read or is no saved plan. At most `limit` bytes of inputs
-// are read.
-RemadePlan remakePlan(const std::string& path, std::uint64_t limit);
+// The same; the inputs are read as far as the limits let them.
+RemadePlan remakePlan(const std::string& path, const migration::ReadLimits& limits);
 
 #endif  // SCHEMA_MIGRATE_PLAN_FILE_H

@@ -7,9 +7,12 @@
 #include <limits>
 #include <string_view>
 #include <system_error>
+#include <utility>
 
 #include "CommandLine.h"
 #include "Messages.h"
+#include "PlanFile.h"
+#include "PlanReport.h"
 #include "Progress.h"
 
 namespace {
@@ -48,6 +51,16 @@ const CLI::Validator kSize(
 
 }  // namespace
 
+void addMaxInput(CLI::App* command, migration::ReadLimits* limits) {
+  command
+      ->add_option(
+          "--max-input", limits->bytes,
+          "refuse inputs of more than SIZE bytes in all, as in 500M or 2G; 1G unless given")
+      ->transform(kSize)
+      ->type_name("SIZE");
+  limits->advice = "if they are meant to, allow more with --max-input";
+}
+
 void PlanOptions::declareInputs(CLI::App* command) {
   command->add_option("--from", request.old, "directory with the old installation's V3.* files")
       ->required()
@@ -64,13 +77,7 @@ void PlanOptions::declareInputs(CLI::App* command) {
       ->type_name("BASE");
   command->add_flag("--accept-base", request.acceptBase,
                     "BASE may equal OLD or NEW, as that of an installation never customised does");
-  command
-      ->add_option(
-          "--max-input", request.limits.bytes,
-          "refuse inputs of more than SIZE bytes in all, as in 500M or 2G; 1G unless given")
-      ->transform(kSize)
-      ->type_name("SIZE");
-  request.limits.advice = "if they are meant to, allow more with --max-input";
+  addMaxInput(command, &request.limits);
 }
 
 void PlanOptions::declareDecisions(CLI::App* command) {
@@ -88,6 +95,57 @@ void PlanOptions::declareDecisions(CLI::App* command) {
       ->add_option("--prefer", m_prefer, "decide clauses that were changed in two ways: old or new")
       ->check(oneOf({"old", "new"}))
       ->type_name("SIDE");
+}
+
+void PlanOptions::declarePlan(CLI::App* command) {
+  command
+      ->add_option("--plan", m_plan,
+                   "carry out this saved plan, which stands for all the options above")
+      ->check(notEmpty())
+      ->type_name("PLAN");
+  std::vector<const CLI::Option*> replaced;
+  for (const char* const name : {"--from", "--to", "--base", "--accept-base", "--exclude-oids",
+                                 "--withdraw", "--decisions", "--allow-unused", "--prefer"}) {
+    CLI::Option* const option = command->get_option(name);
+    option->required(false);
+    replaced.push_back(option);
+  }
+  command->parse_complete_callback([this, replaced] {
+    for (const CLI::Option* const option : replaced) {
+      if (!m_plan.empty() && option->count() != 0) {
+        throw CLI::ValidationError(option->get_name(), "cannot be given with --plan, which has it");
+      }
+    }
+  });
+}
+
+void PlanOptions::readPlan() {
+  if (m_plan.empty()) {
+    if (request.old.empty() || request.latest.empty()) {
+      throw Failure(kUsage,
+                    errorLine(std::string(request.old.empty() ? "--from" : "--to") +
+                              " is required, or --plan; schema-migrate migrate --help tells "
+                              "how it is used"));
+    }
+    return;
+  }
+  LoadedPlan loaded = loadPlan(m_plan);
+  m_source = std::move(loaded.source);
+  m_saved = std::move(loaded.saved);
+  migration::ReadLimits limits = std::move(request.limits);
+  request = m_saved->request;
+  request.limits = std::move(limits);
+}
+
+void PlanOptions::refuseUnlessPlanHolds(const migration::MigrationPlan& again) const {
+  const migration::Failures changes =
+      migration::changesSince(*m_saved, again, SCHEMA_MIGRATE_VERSION);
+  if (!changes.empty()) {
+    throw Failure(
+        kRefused,
+        linesOf(changes) + errorLine("refused: the plan does not hold any more, and nothing was "
+                                     "written; make it again with plan --save"));
+  }
 }
 
 void PlanOptions::makePathsAbsolute() {
@@ -158,20 +216,18 @@ std::string shellWord(const std::string& text) {
 
 std::unique_ptr<migration::MigrationPlan> PlanOptions::makePlan() const {
   migration::PlanRequest wanted = request;
-  wanted.prefer = m_prefer == "old"   ? migration::Prefer::kOld
-                  : m_prefer == "new" ? migration::Prefer::kNew
-                                      : migration::Prefer::kNothing;
+  if (!m_saved) {
+    wanted.prefer = m_prefer == "old"   ? migration::Prefer::kOld
+                    : m_prefer == "new" ? migration::Prefer::kNew
+                                        : migration::Prefer::kNothing;
+  }
   wanted.onStep = progress::step;
   std::unique_ptr<migration::MigrationPlan> plan = migration::makePlan(wanted);
+  if (m_saved) {
+    refuseUnlessPlanHolds(*plan);
+  }
   if (!plan->failures.empty()) {
-    std::string lines;
-    for (const migration::Failure& failure : plan->failures) {
-      const std::string rule = failure.rule.empty() ? "" : " [" + failure.rule + "]";
-      lines += errorLine(
-          failure.line == 0 ? failure.file : placeOf(failure.file, {failure.line, failure.column}),
-          failure.text + rule);
-    }
-    throw Failure(kBadInput, lines);
+    throw Failure(kBadInput, linesOf(plan->failures));
   }
   // Told first, and alone: everything else would be told of the wrong thing.
   const std::string& equal = plan->threeWay.suspiciousBase;

@@ -251,6 +251,14 @@ std::string warningsOf(const MigrationPlan& plan) {
   return lines;
 }
 
+std::string linesOf(const migration::Failures& failures) {
+  std::string lines;
+  for (const migration::Failure& failure : failures) {
+    lines += lineOf(failure);
+  }
+  return lines;
+}
+
 std::string whyNotReady(const MigrationPlan& plan) {
   std::string lines;
   for (const migration::Failure& refusal : plan.refusals) {

@@ -39,6 +39,9 @@ std::string renderFindings(const migration::MigrationPlan& plan);
 // standard error.
 std::string warningsOf(const migration::MigrationPlan& plan);
 
+// A line for each, for standard error.
+std::string linesOf(const migration::Failures& failures);
+
 // A line for whatever refuses the plan and for each definition that is undecided, for standard
 // error.
 std::string whyNotReady(const migration::MigrationPlan& plan);

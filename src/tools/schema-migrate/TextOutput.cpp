@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <set>
 #include <string_view>
 
 #include "Messages.h"
@@ -73,13 +74,18 @@ void verify(const Directory& directory, const OutputText& wanted) {
 
 }  // namespace
 
-void verifyTexts(const Directory& directory, const std::vector<OutputText>& texts) {
-  std::vector<std::string> wanted;
+void verifyTexts(const Directory& directory, const std::vector<OutputText>& texts,
+                 const std::string& folder) {
+  std::set<std::string> expected;
   for (const OutputText& text : texts) {
-    verify(directory, text);
-    wanted.push_back(text.name);
+    if (text.folder == folder) {
+      verify(directory, text);
+      expected.insert(text.name);
+    } else if (folder.empty()) {
+      expected.insert(text.folder);
+    }
   }
-  std::sort(wanted.begin(), wanted.end());
+  const std::vector<std::string> wanted(expected.begin(), expected.end());
   std::vector<std::string> names;
   if (!directory.list(&names)) {
     fail(directory.path(), "cannot be read back: " + systemError(errno));
@@ -91,9 +97,16 @@ void verifyTexts(const Directory& directory, const std::vector<OutputText>& text
 
 void writeTexts(const std::vector<OutputText>& texts, OutputDirectory* output) {
   output->create();
+  std::set<std::string> folders;
   for (const OutputText& text : texts) {
+    if (!text.folder.empty() && folders.insert(text.folder).second) {
+      output->makeFolder(text.folder);
+    }
     output->write(text);
   }
   output->sync();
-  verifyTexts(output->directory(), texts);
+  folders.insert("");
+  for (const std::string& folder : folders) {
+    verifyTexts(output->folder(folder), texts, folder);
+  }
 }

@@ -5,6 +5,7 @@
 #include "Command.h"
 #include "CommandLine.h"
 #include "Messages.h"
+#include "PlanOptions.h"
 #include "VerifyRun.h"
 
 namespace {
@@ -47,6 +48,7 @@ class VerifyCommand : public Command {
         ->required()
         ->check(notEmpty())
         ->type_name("");
+    addMaxInput(verify, &m_options.limits);
     return verify;
   }
 

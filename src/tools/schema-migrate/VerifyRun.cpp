@@ -23,9 +23,7 @@ using migration::PlannedFiles;
 
 Installation readOutput(const VerifyOptions& options) {
   Failures failures;
-  migration::ReadLimits limits;
-  limits.bytes = options.maxInput;
-  Installation output = Installation::fromDirectory(options.directory, limits, &failures);
+  Installation output = Installation::fromDirectory(options.directory, options.limits, &failures);
   if (!failures.empty()) {
     std::string lines;
     for (const migration::Failure& failure : failures) {
@@ -137,13 +135,13 @@ std::string rendered(const migration::Finding& finding) {
 
 VerifyReport verify(const VerifyOptions& options, Console* console) {
   const Installation output = readOutput(options);
-  const RemadePlan plan = remakePlan(options.plan, options.maxInput);
+  const RemadePlan plan = remakePlan(options.plan, options.limits);
   VerifyReport report;
   report.definitionCount = output.entries().size();
   report.fileCount = output.files().size();
   report.planChanges = plan.changes;
   if (!report.planChanges.empty() || !plan.again->failures.empty()) {
-    report.differences = compareDigests(plan.saved, output);
+    report.differences = compareDigests(plan.loaded.saved, output);
     return report;
   }
   report.planChanges = whyNotMigrated(options, *plan.again);

@@ -16,7 +16,7 @@
 struct VerifyOptions {
   std::string plan;
   std::string directory;
-  std::uint64_t maxInput = std::uint64_t{1} << 30;
+  migration::ReadLimits limits;
 };
 
 struct VerifyReport {

@@ -100,7 +100,7 @@ std::string cell(std::string_view text) {
 std::vector<Origin> originsOf(const MigrationPlan& plan, const std::vector<NamedText>& outputs) {
   Failures failures;
   const Installation installation =
-      Installation::fromTexts("output", outputs, ReadLimits(), &failures);
+      Installation::fromTexts("output", outputs, ReadLimits::none(), &failures);
   Tracer tracer(plan);
   std::vector<Origin> origins;
   origins.reserve(installation.entries().size());

@@ -24,7 +24,7 @@ std::string idOf(const Entry& entry) {
 
 Installation installationOf(const PlannedFiles& planned) {
   Failures failures;
-  return Installation::fromTexts("planned", planned.texts, ReadLimits(), &failures);
+  return Installation::fromTexts("planned", planned.texts, ReadLimits::none(), &failures);
 }
 
 // The definitions of one kind and OID, as planned and as found; mostly one each.

@@ -5,6 +5,7 @@
 #include <iterator>
 #include <map>
 #include <nlohmann/json.hpp>
+#include <string_view>
 #include <utility>
 
 #include "PlanDocument.h"
@@ -251,8 +252,12 @@ std::map<InputKey, std::string> byKey(const std::vector<PlanInput>& inputs) {
 std::string whyGone(const std::string& path, const Failures& failures) {
   const auto found = std::find_if(failures.begin(), failures.end(),
                                   [&](const Failure& failure) { return failure.file == path; });
-  return found == failures.end() ? "is no longer there"
-                                 : "cannot be read any more (" + found->text + ")";
+  if (found == failures.end()) {
+    return "is no longer there";
+  }
+  constexpr std::string_view kBeginning = "cannot be read: ";
+  const bool isUsual = found->text.compare(0, kBeginning.size(), kBeginning) == 0;
+  return "cannot be read any more: " + found->text.substr(isUsual ? kBeginning.size() : 0);
 }
 
 void compareInputs(const SavedPlan& saved, const MigrationPlan& again, Failures* changes) {
@@ -262,8 +267,8 @@ void compareInputs(const SavedPlan& saved, const MigrationPlan& again, Failures*
     const auto found = now.find(key);
     if (found == now.end()) {
       changes->push_back({key.second, 0, 0, "",
-                          "the plan was made from it, and it " +
-                              whyGone(key.second, again.failures) + " (" + key.first + ")"});
+                          "the plan was made from it (" + key.first + "), and it " +
+                              whyGone(key.second, again.failures)});
     } else if (found->second != digest) {
       changes->push_back({key.second, 0, 0, "",
                           "is not what the plan was made from (" + key.first +
