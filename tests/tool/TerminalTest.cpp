@@ -105,6 +105,30 @@ TEST_F(OnTerminal, ReportsFitItsWidth) {
   }
 }
 
+TEST_F(OnTerminal, TheTableOfAMigrationHasWhatRoomThereIs) {
+  const std::vector<std::string>& migrate = kReports[2];
+  ASSERT_EQ(migrate.front(), "migrate");
+  EXPECT_NE(
+      onScreen(on(90, migrate))
+          .find("File               read OLD  read NEW     kept    added  replaced   merged   "
+                "written\n"
+                "V3.user.at                1         1        0        0         1        0  "
+                "       1\n"),
+      std::string::npos)
+      << onScreen(on(90, migrate));
+  EXPECT_NE(onScreen(on(80, migrate))
+                .find("File               read OLD read NEW kept added replaced merged written\n"
+                      "V3.user.at                1        1    0     0        1      0       1\n"),
+            std::string::npos)
+      << onScreen(on(80, migrate));
+  EXPECT_NE(onScreen(on(40, migrate))
+                .find("V3.user.at\n"
+                      "  read OLD 1, read NEW 1, kept 0, added\n"
+                      "  0, replaced 1, merged 0, written 1\n"),
+            std::string::npos)
+      << onScreen(on(40, migrate));
+}
+
 TEST_F(OnTerminal, AWrappedValueStandsBelowItsBeginning) {
   EXPECT_NE(onScreen(on(60, kReports.front()))
                 .find("    old     'one two three four five six seven eight nine\n"

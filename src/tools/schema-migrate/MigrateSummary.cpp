@@ -3,7 +3,15 @@
 #include <algorithm>
 #include <array>
 #include <cstddef>
+#include <numeric>
+#include <string>
+#include <string_view>
 #include <unordered_map>
+#include <utility>
+#include <vector>
+
+#include "DisplayText.h"
+#include "Terminal.h"
 
 namespace {
 
@@ -45,21 +53,79 @@ struct Row {
   }
 };
 
-std::string column(std::size_t number, std::size_t width) {
-  const std::string text = std::to_string(number);
+struct Column {
+  const char* title;
+  std::size_t width;  // where there is room
+  std::size_t (*value)(const Row& row);
+};
+
+std::size_t allOf(const Row& row) {
+  return std::accumulate(row.written.begin(), row.written.end(), std::size_t{0});
+}
+
+constexpr std::size_t kNameWidth = 18;
+constexpr std::array<Column, 7> kColumns = {{
+    {"read OLD", 9, [](const Row& row) { return row.old; }},
+    {"read NEW", 10, [](const Row& row) { return row.latest; }},
+    {"kept", 9, [](const Row& row) { return row.written[kKept]; }},
+    {"added", 9, [](const Row& row) { return row.written[kAdded]; }},
+    {"replaced", 10, [](const Row& row) { return row.written[kReplaced]; }},
+    {"merged", 9, [](const Row& row) { return row.written[kMerged]; }},
+    {"written", 10, allOf},
+}};
+
+using Rows = std::vector<std::pair<std::string, Row>>;  // by what stands in the first column
+
+std::string atRight(const std::string& text, std::size_t width) {
   return std::string(width > text.size() ? width - text.size() : 1, ' ') + text;
 }
 
-std::string formatted(std::string name, const Row& row) {
-  constexpr std::size_t kNameWidth = 18;
-  name.resize(std::max(name.size(), kNameWidth), ' ');
-  std::size_t all = 0;
-  for (const std::size_t count : row.written) {
-    all += count;
+std::string asTable(const Rows& rows, const std::array<std::size_t, kColumns.size()>& widths) {
+  std::string text = padded("File", kNameWidth);
+  for (std::size_t i = 0; i < kColumns.size(); ++i) {
+    text += atRight(kColumns[i].title, widths[i]);
   }
-  return name + column(row.old, 9) + column(row.latest, 10) + column(row.written[kKept], 9) +
-         column(row.written[kAdded], 9) + column(row.written[kReplaced], 10) +
-         column(row.written[kMerged], 9) + column(all, 10) + "\n";
+  text += "\n";
+  for (const auto& [name, row] : rows) {
+    text += padded(name, kNameWidth);
+    for (std::size_t i = 0; i < kColumns.size(); ++i) {
+      text += atRight(std::to_string(kColumns[i].value(row)), widths[i]);
+    }
+    text += "\n";
+  }
+  return text;
+}
+
+// A table in columns as wide as there is room for, or a line of words for each file.
+std::string inWidth(const Rows& rows, std::size_t width) {
+  std::array<std::size_t, kColumns.size()> widths{};
+  for (std::size_t i = 0; i < kColumns.size(); ++i) {
+    widths[i] = kColumns[i].width;
+  }
+  std::string text = asTable(rows, widths);
+  if (text.find('\n') <= width) {
+    return text;
+  }
+  for (std::size_t i = 0; i < kColumns.size(); ++i) {
+    widths[i] = std::string_view(kColumns[i].title).size() + 1;
+    for (const auto& [name, row] : rows) {
+      widths[i] = std::max(widths[i], std::to_string(kColumns[i].value(row)).size() + 1);
+    }
+  }
+  text = asTable(rows, widths);
+  if (text.find('\n') <= width) {
+    return text;
+  }
+  text.clear();
+  for (const auto& [name, row] : rows) {
+    std::string words;
+    for (const Column& column : kColumns) {
+      words += (words.empty() ? "" : ", ") + std::string(column.title) + " " +
+               std::to_string(column.value(row));
+    }
+    text += name + "\n" + wrapped("  ", words, width);
+  }
+  return text;
 }
 
 std::string tableOf(const MigrationPlan& plan, const Installation& result) {
@@ -81,16 +147,16 @@ std::string tableOf(const MigrationPlan& plan, const Installation& result) {
   for (const Entry& entry : result.entries()) {
     ++rows[entry.file->name].written[origins[idOf(entry.kind(), entry.kept->object->oidInPlace())]];
   }
-  std::string text =
-      "File               read OLD  read NEW     kept    added  replaced   merged   written\n";
+  Rows shown;
   Row total;
   for (const char* const file : kShownOrder) {
     if (plan.old->hasFile(file) || result.hasFile(file)) {
-      text += formatted(file, rows[file]);
+      shown.emplace_back(file, rows[file]);
       total.add(rows[file]);
     }
   }
-  return text + formatted("Total", total);
+  shown.emplace_back("Total", total);
+  return inWidth(shown, longestLine());
 }
 
 }  // namespace
