@@ -16,12 +16,14 @@ migrate_example() {
     --decisions examples/decisions.toml)
   mkdir -p "$folder"
   shown "$tool" plan "${inputs[@]}" --save "$folder/plan.json"
-  shown "$tool" migrate "${inputs[@]}" --out "$folder/migrated" --html "$folder/migrated.html"
+  shown "$tool" migrate --plan "$folder/plan.json" --out "$folder/migrated" --record "$folder/ticket" \
+    --html "$folder/migrated.html"
   shown "$tool" verify --plan "$folder/plan.json" "$folder/migrated"
   cat <<END
 
 The migrated schema:         $folder/migrated
 What came of it, to browse:  $folder/migrated.html
+For the change ticket:       $folder/ticket
 The plan that was verified:  $folder/plan.json
 What the example shows:      examples/README.md
 An upgrade step by step:     docs/guide.md
