@@ -6,16 +6,19 @@
 #include <array>
 #include <memory>
 #include <optional>
+#include <set>
 #include <unordered_map>
 #include <utility>
 
 #include "Check.h"
 #include "Digest.h"
+#include "Members.h"
 #include "Merge.h"
 #include "References.h"
 #include "ResultIndex.h"
 #include "RuleSupport.h"
 #include "Source.h"
+#include "ThreeWay.h"
 
 namespace migration {
 
@@ -161,11 +164,16 @@ bool isList(Aspect aspect) {
 // Carries one decision out on its row. Every function returns what is wrong, or "".
 class Carrying {
  public:
-  Carrying(const Decision& decision, Verdict* row) : m_decision(decision), m_row(*row) {}
+  Carrying(const Decision& decision, const ThreeWayRequest& request, const ResultIndex* ofNew,
+           Verdict* row)
+      : m_decision(decision), m_request(request), m_ofNew(ofNew), m_row(*row) {}
 
   std::string run() {
     Verdict before = m_row;
     std::string problem = decide();
+    if (problem.empty()) {
+      problem = whyNewsHasToStay();
+    }
     if (!problem.empty()) {
       m_row = std::move(before);
       return problem;
@@ -179,11 +187,8 @@ class Carrying {
     if (m_row.outcome == Outcome::kExcluded || m_row.outcome == Outcome::kWithdrawn) {
       return "a list of OIDs leaves it out already";
     }
-    const bool isByLatestOnly =
-        m_row.match.latest != nullptr && m_row.match.latest->file->name.rfind("V3.config.", 0) == 0;
-    if (isByLatestOnly && m_decision.take != Take::kNew) {
-      return "NEW has it only in a config file, which is carried over as it is: only \"new\" can "
-             "be taken";
+    if (m_row.isNewsOnly && m_decision.take != Take::kNew) {
+      return whyNewsOnly();
     }
     if (!m_decision.text.empty()) {
       return takeText();
@@ -194,6 +199,27 @@ class Carrying {
     const bool onlyIdentity = m_decision.take == Take::kNothing;
     const std::string problem = onlyIdentity ? (m_row.isCarried() ? "" : takeOld()) : takeWhole();
     return problem.empty() ? changeIdentity() : problem;
+  }
+
+  std::string whyNewsOnly() const {
+    const Entry* const latest = m_row.match.latest;
+    if (m_row.behind != nullptr) {
+      return whyIdentityStays(m_row) + ": only \"new\" can be taken";
+    }
+    if (m_row.kind() != Kind::kVendorExtension && !isConfigFile(*latest->file)) {
+      return "NEW has another definition under its OID too, and the library finds only that one: "
+             "only \"new\" can be taken";
+    }
+    return std::string("NEW has ") +
+           (latest != nullptr && isConfigFile(*latest->file) ? "it" : "its attribute type") +
+           " only in a config file, which is carried over as it is: only \"new\" can be taken";
+  }
+
+  std::string whyNewsHasToStay() const {
+    const bool goes = m_row.isTakenOut || (m_row.isCarried() && m_row.match.latest != nullptr &&
+                                           m_row.kind() != Kind::kVendorExtension &&
+                                           hasOtherIdentity(*m_row.result, *m_row.match.latest));
+    return m_row.behind != nullptr && goes ? whyIdentityStays(m_row) : "";
   }
 
   std::string takeWhole() {
@@ -241,7 +267,7 @@ class Carrying {
 
   std::string takeMerged() {
     for (const ClauseChange& change : m_row.clauses) {
-      if (change.isInConflict && !isList(change.aspect)) {
+      if (change.isInConflict && !change.isDecided && !isList(change.aspect)) {
         return "it cannot be merged: " + std::string(nameOf(change.aspect)) +
                " was changed in two ways; decide it by \"clauses\"";
       }
@@ -302,9 +328,9 @@ class Carrying {
     }
     const Content old = contentOf(*match.old->kept);
     const Content latest = contentOf(*match.latest->kept);
-    Merge merged = match.base == nullptr
-                       ? mergeWithoutBase(old, latest, Prefer::kNothing)
-                       : mergeWithBase(contentOf(*match.base->kept), old, latest, Prefer::kNothing);
+    const Prefer prefer = isOpenToPreference(m_row) ? m_request.prefer : Prefer::kNothing;
+    Merge merged = match.base == nullptr ? mergeWithoutBase(old, latest, prefer)
+                                         : mergeWithBase(baseContentOf(m_row), old, latest, prefer);
     std::string open;
     for (ClauseChange& change : merged.changes) {
       if (std::optional<Values> value = decide(change)) {
@@ -322,7 +348,9 @@ class Carrying {
     if (merged.result[Aspect::kOid].empty()) {
       return "it leaves the definition without an OID";
     }
-    dropRepeated(&merged);
+    const std::optional<Content> base =
+        match.base == nullptr ? std::nullopt : std::optional<Content>(baseContentOf(m_row));
+    dropRepeated(base ? &*base : nullptr, old, latest, &merged);
     m_row.clauses = std::move(merged.changes);
     const bool isOld = areEqual(merged.result, old) && merged.result.oid() == old.oid();
     const bool isNew = areEqual(merged.result, latest) && merged.result.oid() == latest.oid();
@@ -350,8 +378,12 @@ class Carrying {
       return "only a definition of the site's that stays can be renamed or renumbered";
     }
     if (!m_decision.rename.empty()) {
+      Values& aliases = (*m_row.result)[Aspect::kAliases];
+      if (m_ofNew != nullptr && m_row.isTaken && m_row.match.old != nullptr) {
+        giveUp(takenNames(*m_ofNew, m_row), &aliases);
+      }
       (*m_row.result)[Aspect::kFirstName] = {m_decision.rename};
-      dropAliasesOfNewName();
+      dropMembersOf({m_decision.rename}, &aliases);
     }
     if (!m_decision.renumber.empty()) {
       (*m_row.result)[Aspect::kOid] = {m_decision.renumber};
@@ -359,42 +391,49 @@ class Carrying {
     return "";
   }
 
-  // An alias equal to the new first name goes.
-  void dropAliasesOfNewName() {
-    Values& aliases = (*m_row.result)[Aspect::kAliases];
-    aliases.erase(std::remove_if(aliases.begin(), aliases.end(),
-                                 [&](const std::string& alias) {
-                                   return equalFolded(alias, m_decision.rename);
-                                 }),
-                  aliases.end());
+  // What is another definition's in NEW cannot stay an alias either.
+  void giveUp(const Values& taken, Values* aliases) {
+    const Values before = *aliases;
+    if (!dropMembersOf(taken, aliases)) {
+      return;
+    }
+    for (const std::string& alias : before) {
+      if (!contains(*aliases, alias)) {
+        m_row.notes.push_back("its alias '" + alias + "' is another definition's in NEW, and goes");
+      }
+    }
   }
 
   const Decision& m_decision;
+  const ThreeWayRequest& m_request;
+  const ResultIndex* m_ofNew;  // what NEW gives; null when nothing is renamed
   Verdict& m_row;
 };
 
-// What the result would have twice because of a decision; empty when all is well.
+// What the result would have twice because of a decision; empty when all is well. What NEW itself
+// has twice is no decision's fault.
 // `self` is the row as the index has it.
 std::string clashOf(const ResultIndex& index, const Verdict& row, const Verdict* self) {
+  const bool isNews = !row.isCarried();
   const auto told = [](const std::string& what, const Verdict& holder) {
     return "its " + what + " would also be that of " + describe(holder);
   };
-  if (!row.isCarried()) {
+  if (!row.isInResult()) {
     return "";
   }
   if (row.kind() == Kind::kVendorExtension) {
     for (const std::string& name : dbNamesInResult(row)) {
-      if (const Verdict* const holder = index.byDbName(name, self)) {
+      if (const Verdict* const holder = index.byDbName(name, self, isNews)) {
         return told("DBNAME '" + name + "'", *holder);
       }
     }
     return "";
   }
-  if (const Verdict* const holder = index.byOid(row.result->oid(), self)) {
-    return told("OID " + row.result->oid(), *holder);
+  if (const Verdict* const holder = index.byOid(oidInResult(row), self, isNews)) {
+    return told("OID " + oidInResult(row), *holder);
   }
-  for (const std::string& name : row.result->names()) {
-    if (const Verdict* const holder = index.byName(row.kind(), name, self)) {
+  for (const std::string& name : namesInResult(row)) {
+    if (const Verdict* const holder = index.byName(row.kind(), name, self, isNews)) {
       return told("name '" + name + "'", *holder);
     }
   }
@@ -403,16 +442,23 @@ std::string clashOf(const ResultIndex& index, const Verdict& row, const Verdict*
 
 class Applying {
  public:
-  Applying(const std::vector<Decision>& decisions, std::vector<Verdict>* rows, Failures* failures)
-      : m_decisions(decisions), m_rows(*rows), m_index(rows), m_failures(*failures) {}
+  Applying(const ThreeWayRequest& request, std::vector<Verdict>* rows, Failures* failures)
+      : m_request(request),
+        m_decisions(request.decisions),
+        m_rows(*rows),
+        m_index(rows),
+        m_failures(*failures) {}
 
-  void run(bool allowUnused) {
+  void run() {
+    findStale();
     splitRenamed();
+    // What NEW gives, before anybody takes it.
+    m_ofNew.emplace(m_rows, ResultIndex::Of::kNew);
     for (const Decision& decision : m_decisions) {
       const std::optional<std::size_t> row = m_index.find(decision);
       if (row) {
         carryOut(decision, *row);
-      } else if (!allowUnused) {
+      } else if (!m_request.allowUnused) {
         fail(decision,
              "it matches no definition of BASE, OLD or NEW; remove it, or allow entries "
              "that match nothing");
@@ -423,14 +469,24 @@ class Applying {
   }
 
  private:
+  // Before anything is split, as the entries were made for the whole.
+  void findStale() {
+    for (const Decision& decision : m_decisions) {
+      const std::optional<std::size_t> row = m_index.find(decision);
+      if (row && !decision.fingerprint.empty() &&
+          decision.fingerprint != fingerprintOf(m_rows[*row])) {
+        m_stale.insert(&decision);
+      }
+    }
+  }
+
   // A definition that gets a name or an OID of its own stands beside NEW's.
   void splitRenamed() {
     bool isSplit = false;
     for (const Decision& decision : m_decisions) {
       const std::optional<std::size_t> row = m_index.find(decision);
-      if (row && isToBeSplit(decision, m_rows[*row])) {
-        const std::string fingerprint = fingerprintOf(m_rows[*row]);
-        m_fingerprints[split(*row, &m_rows)] = fingerprint;
+      if (row && m_stale.count(&decision) == 0 && isToBeSplit(decision, m_rows[*row])) {
+        split(*row, &m_rows);
         isSplit = true;
       }
     }
@@ -443,12 +499,6 @@ class Applying {
     m_failures.push_back({decision.file, decision.line, 1, "", text});
   }
 
-  // What is split was one difference when the decision about it was made.
-  std::string currentFingerprint(std::size_t row) const {
-    const auto whole = m_fingerprints.find(row);
-    return whole == m_fingerprints.end() ? fingerprintOf(m_rows[row]) : whole->second;
-  }
-
   void carryOut(const Decision& decision, std::size_t row) {
     const auto [made, isNew] = m_made.emplace(row, &decision);
     const std::string who = "the decision about " + describe(m_rows[row]);
@@ -459,13 +509,13 @@ class Applying {
       }
       return;
     }
-    if (!decision.fingerprint.empty() && decision.fingerprint != currentFingerprint(row)) {
+    if (m_stale.count(&decision) != 0) {
       fail(decision, who +
                          " is stale: the definition has changed since it was made; look at it "
                          "again, and make it anew");
       return;
     }
-    const std::string problem = Carrying(decision, &m_rows[row]).run();
+    const std::string problem = Carrying(decision, m_request, &*m_ofNew, &m_rows[row]).run();
     if (!problem.empty()) {
       fail(decision, who + " cannot be carried out: " + problem);
     }
@@ -475,12 +525,25 @@ class Applying {
   void checkResult() {
     const ResultIndex index(m_rows, ResultIndex::Of::kAll);
     for (const auto& [row, decision] : m_made) {
+      if (m_rows[row].decision.empty()) {
+        continue;
+      }
+      const std::string who =
+          "the decision about " + describe(m_rows[row]) + " cannot be carried out: ";
       const std::string clash = clashOf(index, m_rows[row], &m_rows[row]);
-      if (!clash.empty() && !m_rows[row].decision.empty()) {
-        fail(*decision, "the decision about " + describe(m_rows[row]) + " cannot be carried out: " +
-                            clash + "; rename or renumber it, or take NEW's");
+      if (!clash.empty()) {
+        fail(*decision, who + clash + "; rename or renumber it, or take NEW's");
+      } else if (lacksItsAttribute(m_rows[row])) {
+        fail(*decision, who + "its attribute type is not in the result");
       }
     }
+  }
+
+  bool lacksItsAttribute(const Verdict& extension) const {
+    if (extension.kind() != Kind::kVendorExtension || !extension.isCarried()) {
+      return false;
+    }
+    return extension.match.attribute == kNoRow || !m_rows[extension.match.attribute].isInResult();
   }
 
   // References to what is renamed or renumbered follow.
@@ -504,12 +567,14 @@ class Applying {
     }
   }
 
+  const ThreeWayRequest& m_request;
   const std::vector<Decision>& m_decisions;
   std::vector<Verdict>& m_rows;
   RowIndex m_index;
+  std::optional<ResultIndex> m_ofNew;
   Failures& m_failures;
+  std::set<const Decision*> m_stale;
   std::map<std::size_t, const Decision*> m_made;
-  std::map<std::size_t, std::string> m_fingerprints;  // of what was split
 };
 
 }  // namespace
@@ -521,20 +586,28 @@ std::string fingerprintOf(const Verdict& difference) {
     text += entry == nullptr ? "-" : textOf(contentOf(*entry->kept));
     text += '\n';
   }
+  const auto& extensions = difference.extensions;
+  if (std::any_of(extensions.begin(), extensions.end(),
+                  [](const Entry* extension) { return extension != nullptr; })) {
+    for (const Entry* const extension : extensions) {
+      text += extension == nullptr ? "-" : textOf(contentOf(*extension->kept));
+      text += '\n';
+    }
+  }
   return "sha256:" + sha256Of(text);
 }
 
-std::string tryDecision(const Decision& decision, const ResultIndex& result,
-                        const Verdict& difference, Verdict* after) {
+std::string tryDecision(const Decision& decision, const ThreeWayRequest& request,
+                        const ResultIndex& result, const Verdict& difference, Verdict* after) {
   *after = difference;
-  const std::string problem = Carrying(decision, after).run();
+  const std::string problem = Carrying(decision, request, nullptr, after).run();
   return problem.empty() ? clashOf(result, *after, &difference) : problem;
 }
 
-void applyDecisions(const std::vector<Decision>& decisions, bool allowUnused,
-                    std::vector<Verdict>* differences, Failures* failures) {
-  if (!decisions.empty()) {
-    Applying(decisions, differences, failures).run(allowUnused);
+void applyDecisions(const ThreeWayRequest& request, std::vector<Verdict>* differences,
+                    Failures* failures) {
+  if (!request.decisions.empty()) {
+    Applying(request, differences, failures).run();
   }
 }
 

@@ -45,22 +45,24 @@ struct Decision {
 // *decisions. What is malformed is a failure at its line, and the entry is left out.
 void readDecisions(const Source& source, std::vector<Decision>* decisions, Failures* failures);
 
-// The fingerprint of a definition as BASE, OLD and NEW have it, in the order of the three: what the
-// readings keep, so that neither place nor layout matter.
+// The fingerprint of a definition as BASE, OLD and NEW have it, in the order of the three, and of
+// the vendor extension that goes with it: what the readings keep, so that neither place nor layout
+// matter.
 std::string fingerprintOf(const Verdict& difference);
 
-// Carries the decisions out on the differences. Entries that match nothing (unless that is
-// allowed), are stale, contradict another or cannot be carried out are failures, and change
+// Carries the decisions of the request out on the differences. Entries that match nothing (unless
+// that is allowed), are stale, contradict another or cannot be carried out are failures, and change
 // nothing.
-void applyDecisions(const std::vector<Decision>& decisions, bool allowUnused,
-                    std::vector<Verdict>* differences, Failures* failures);
+struct ThreeWayRequest;
+void applyDecisions(const ThreeWayRequest& request, std::vector<Verdict>* differences,
+                    Failures* failures);
 
 class ResultIndex;
 // What one decision would come to: *after is the difference with it carried out. Returns what is
 // wrong, or "". `result` has everything that the result has so far, and the difference is one of
 // its.
-std::string tryDecision(const Decision& decision, const ResultIndex& result,
-                        const Verdict& difference, Verdict* after);
+std::string tryDecision(const Decision& decision, const ThreeWayRequest& request,
+                        const ResultIndex& result, const Verdict& difference, Verdict* after);
 
 }  // namespace migration
 

@@ -11,6 +11,8 @@
 #include <optional>
 #include <set>
 #include <system_error>
+#include <unordered_map>
+#include <unordered_set>
 #include <utility>
 
 #include "ResultIndex.h"
@@ -205,50 +207,132 @@ Failures unwritable(const ThreeWay& threeWay) {
   return failures;
 }
 
-std::string idOf(const Verdict& row) {
-  return static_cast<char>('0' + static_cast<int>(row.kind())) + oidInResult(row);
+std::string idOf(Kind kind, const std::string& oid, const std::string& firstName) {
+  return static_cast<char>('0' + static_cast<int>(kind)) + oid + ' ' + firstName;
+}
+
+std::string idOf(const Entry& entry) {
+  return idOf(entry.kind(), oidOf(entry),
+              entry.kind() == Kind::kVendorExtension ? std::string() : foldedFirstNameOf(entry));
+}
+
+std::string foldedFirstNameInResult(const Verdict& row) {
+  const Values names = row.kind() == Kind::kVendorExtension ? Values() : namesInResult(row);
+  return names.empty() ? std::string() : folded(names.front());
+}
+
+std::string idInResult(const Verdict& row) {
+  return idOf(row.kind(), oidInResult(row), foldedFirstNameInResult(row));
+}
+
+// What is not as it was planned: of what comes of OLD, or of a decision; and of NEW's own.
+struct Deviations {
+  Failures ofPlan;
+  Failures ofNews;
+};
+
+class Comparing {
+ public:
+  Comparing(const ThreeWay& threeWay, const Installation& result)
+      : m_threeWay(threeWay), m_result(result) {
+    for (const Entry& entry : result.entries()) {
+      m_entries.emplace(idOf(entry), &entry);
+    }
+  }
+
+  Deviations run() {
+    for (const Verdict& row : m_threeWay.differences) {
+      if (row.match.latest != nullptr && (row.isCarried() || row.isTakenOut)) {
+        m_replaced.insert(idOf(*row.match.latest));
+      }
+      if (row.isInResult()) {
+        lookFor(row);
+      }
+    }
+    for (const Entry* const entry : m_threeWay.uncountedOfNew) {
+      lookForUncounted(*entry);
+    }
+    for (const Entry& entry : m_result.entries()) {
+      if (m_planned.count(idOf(entry)) == 0) {
+        m_deviations.ofPlan.push_back(
+            {entry.file->name, entry.place().line, entry.place().column, "",
+             describe(*entry.kept) + " is in the result, and was not planned"});
+      }
+    }
+    return std::move(m_deviations);
+  }
+
+ private:
+  // What counts in the result must be the planned one.
+  void lookFor(const Verdict& row) {
+    m_planned.insert(idInResult(row));
+    const Entry* const entry = row.kind() == Kind::kVendorExtension
+                                   ? m_result.byOid(row.kind(), oidInResult(row))
+                                   : m_result.byFirstName(row.kind(), foldedFirstNameInResult(row));
+    const bool isThere = entry != nullptr && idOf(*entry) == idInResult(row);
+    const bool isAsPlanned =
+        isThere && (row.isCarried() ? contentOf(*entry->kept).values == row.result->values
+                                    : haveEqualValues(*entry, *row.match.latest));
+    if (!isAsPlanned) {
+      // NEW's OID may be another definition's in NEW too.
+      const bool isNews = row.match.latest != nullptr &&
+                          (!row.isCarried() || oidInResult(row) == oidOf(*row.match.latest));
+      Failures& failures = isNews ? m_deviations.ofNews : m_deviations.ofPlan;
+      const std::string text =
+          describe(row) + (isThere ? " is not what was planned" : " is not in the result");
+      failures.push_back({m_result.directory(), 0, 0, "", text});
+    }
+  }
+
+  static bool haveEqualValues(const Entry& left, const Entry& right) {
+    return contentOf(*left.kept).values == contentOf(*right.kept).values;
+  }
+
+  // One that does not count in NEW stays, unless it is replaced with the one that does.
+  void lookForUncounted(const Entry& entry) {
+    const std::string id = idOf(entry);
+    if (!isConfigFile(entry.file->name) && m_replaced.count(id) != 0) {
+      return;
+    }
+    m_planned.insert(id);
+    const auto [begin, end] = m_entries.equal_range(id);
+    const bool isThere = std::any_of(
+        begin, end, [&](const auto& found) { return haveEqualValues(*found.second, entry); });
+    if (!isThere) {
+      m_deviations.ofNews.push_back(
+          {m_result.directory(), 0, 0, "",
+           describe(*entry.kept) + " of " + fileAndLine(entry) + " in NEW is not in the result"});
+    }
+  }
+
+  const ThreeWay& m_threeWay;
+  const Installation& m_result;
+  std::unordered_multimap<std::string, const Entry*> m_entries;
+  std::unordered_set<std::string> m_planned;
+  std::unordered_set<std::string> m_replaced;
+  Deviations m_deviations;
+};
+
+Deviations compareWithPlan(const ThreeWay& threeWay, const std::vector<NamedText>& texts) {
+  Failures failures;
+  const Installation result =
+      Installation::fromTexts("result", texts, ReadLimits::none(), &failures);
+  Deviations deviations = Comparing(threeWay, result).run();
+  deviations.ofPlan.insert(deviations.ofPlan.begin(), failures.begin(), failures.end());
+  return deviations;
+}
+
+Failures together(Deviations deviations) {
+  Failures all = std::move(deviations.ofPlan);
+  all.insert(all.end(), deviations.ofNews.begin(), deviations.ofNews.end());
+  return all;
 }
 
 }  // namespace
 
 Failures differencesFromPlan(const ThreeWay& threeWay, const Installation& result) {
-  Failures failures;
-  std::set<std::string> planned;
-  for (const Verdict& row : threeWay.differences) {
-    if (!row.isInResult()) {
-      continue;
-    }
-    planned.insert(idOf(row));
-    const Entry* const entry = result.byOid(row.kind(), oidInResult(row));
-    const Content wanted = row.isCarried() ? *row.result : contentOf(*row.match.latest->kept);
-    if (entry == nullptr || contentOf(*entry->kept).values != wanted.values) {
-      failures.push_back({result.directory(), 0, 0, "",
-                          describe(row) + (entry == nullptr ? " is not in the result"
-                                                            : " is not what was planned")});
-    }
-  }
-  for (const Entry& entry : result.entries()) {
-    const std::string id = static_cast<char>('0' + static_cast<int>(entry.kind())) + oidOf(entry);
-    if (planned.count(id) == 0) {
-      failures.push_back({entry.file->name, entry.place().line, entry.place().column, "",
-                          describe(*entry.kept) + " is in the result, and was not planned"});
-    }
-  }
-  return failures;
+  return together(Comparing(threeWay, result).run());
 }
-
-namespace {
-
-Failures compareWithPlan(const ThreeWay& threeWay, const std::vector<NamedText>& texts) {
-  Failures failures;
-  const Installation result =
-      Installation::fromTexts("result", texts, ReadLimits::none(), &failures);
-  const Failures found = differencesFromPlan(threeWay, result);
-  failures.insert(failures.end(), found.begin(), found.end());
-  return failures;
-}
-
-}  // namespace
 
 Execution execute(const ThreeWayRequest& request, const ThreeWay& threeWay,
                   const std::string& directory) {
@@ -267,9 +351,12 @@ Execution execute(const ThreeWayRequest& request, const ThreeWay& threeWay,
         execution.inLibraryLayout.push_back({file.name, std::string(file.source->bytes())});
       }
     }
-    execution.failures = compareWithPlan(threeWay, execution.inNewsLayout);
+    execution.failures = together(compareWithPlan(threeWay, execution.inNewsLayout));
+    Deviations deviations = compareWithPlan(threeWay, execution.inLibraryLayout);
+    execution.failures.insert(execution.failures.end(), deviations.ofPlan.begin(),
+                              deviations.ofPlan.end());
     execution.departsFromPlan = !execution.failures.empty();
-    execution.notCarriedByLibrary = compareWithPlan(threeWay, execution.inLibraryLayout);
+    execution.notCarriedByLibrary = std::move(deviations.ofNews);
   } catch (const Stop& stopped) {
     execution.failures.push_back(stopped.failure);
     execution.departsFromPlan = stopped.isOfPlan;

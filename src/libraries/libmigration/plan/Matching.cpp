@@ -147,7 +147,7 @@ class Extensions {
         }
         const auto place = byOid.find(oidOf(*extension));
         std::size_t row = place == byOid.end() ? rows->size() : place->second;
-        if (row != rows->size() && (*rows)[row].*kSides[side] != nullptr) {
+        if (row != rows->size() && !mayStandIn((*rows)[row], side, *extension, *rows)) {
           row = rows->size();
         }
         if (row == rows->size()) {
@@ -157,6 +157,13 @@ class Extensions {
         (*rows)[row].*kSides[side] = extension;
       }
     }
+  }
+
+  // One that is without an attribute type on its side is not that of another one.
+  static bool mayStandIn(const MatchRow& row, std::size_t side, const Entry& extension,
+                         const std::vector<MatchRow>& rows) {
+    const Entry* const type = row.attribute == kNoRow ? nullptr : rows[row.attribute].*kSides[side];
+    return row.*kSides[side] == nullptr && (type == nullptr || oidOf(*type) == oidOf(extension));
   }
 
   const Side* m_sides[3];

@@ -5,13 +5,16 @@
 #include <cstdlib>
 #include <utility>
 
+#include "Members.h"
+
 namespace migration {
 
 namespace {
 
 bool hasAllOf(const Values& values, const Values& members) {
+  const Members all(values);
   return std::all_of(members.begin(), members.end(),
-                     [&](const std::string& member) { return contains(values, member); });
+                     [&](const std::string& member) { return all.has(member); });
 }
 
 bool isMemberList(Aspect aspect) {
@@ -20,14 +23,17 @@ bool isMemberList(Aspect aspect) {
 
 // NEW's members less those that OLD took out of the base's, then those that OLD added to them.
 Values mergedMembers(const Values& base, const Values& old, const Values& latest) {
+  const Members ofBase(base);
+  const Members ofOld(old);
+  const Members ofNew(latest);
   Values merged;
   for (const std::string& member : latest) {
-    if (contains(old, member) || !contains(base, member)) {
+    if (ofOld.has(member) || !ofBase.has(member)) {
       merged.push_back(member);
     }
   }
   for (const std::string& member : old) {
-    if (!contains(base, member) && !contains(merged, member)) {
+    if (!ofBase.has(member) && !ofNew.has(member)) {
       merged.push_back(member);
     }
   }
@@ -118,25 +124,33 @@ Risk riskOf(Aspect aspect, const Values& from, const Values& to) {
   }
 }
 
-void dropRepeated(Merge* merge) {
-  const auto drop = [&](Aspect from, const Values& others, const char* note) {
-    Values& members = merge->result[from];
-    const auto end = std::remove_if(members.begin(), members.end(), [&](const std::string& member) {
-      return contains(others, member);
-    });
-    if (end == members.end()) {
+void dropRepeated(const Content* base, const Content& old, const Content& latest, Merge* merge) {
+  Content& result = merge->result;
+  const auto tell = [&](Aspect aspect, const char* note) {
+    const auto change =
+        std::find_if(merge->changes.begin(), merge->changes.end(),
+                     [&](const ClauseChange& each) { return each.aspect == aspect; });
+    if (change != merge->changes.end()) {
+      change->result = result[aspect];
+      change->note = note;
       return;
     }
-    members.erase(end, members.end());
-    for (ClauseChange& change : merge->changes) {
-      if (change.aspect == from) {
-        change.result = members;
-        change.note = note;
-      }
-    }
+    ClauseChange added;
+    added.aspect = aspect;
+    added.base = base == nullptr ? Values() : (*base)[aspect];
+    added.old = old[aspect];
+    added.latest = latest[aspect];
+    added.result = result[aspect];
+    added.risk = riskOf(aspect, added.latest, added.result);
+    added.note = note;
+    merge->changes.push_back(std::move(added));
   };
-  drop(Aspect::kAliases, merge->result[Aspect::kFirstName], "");
-  drop(Aspect::kMay, merge->result[Aspect::kMust], "a member of both MUST and MAY stays in MUST");
+  if (dropMembersOf(result[Aspect::kFirstName], &result[Aspect::kAliases])) {
+    tell(Aspect::kAliases, "");
+  }
+  if (dropMembersOf(result[Aspect::kMust], &result[Aspect::kMay])) {
+    tell(Aspect::kMay, "a member of both MUST and MAY stays in MUST");
+  }
 }
 
 Merge mergeWithBase(const Content& base, const Content& old, const Content& latest, Prefer prefer) {
@@ -166,7 +180,7 @@ Merge mergeWithBase(const Content& base, const Content& old, const Content& late
     }
     add(std::move(change), &merge);
   }
-  dropRepeated(&merge);
+  dropRepeated(&base, old, latest, &merge);
   return merge;
 }
 
@@ -185,7 +199,7 @@ Merge mergeWithoutBase(const Content& old, const Content& latest, Prefer prefer)
     decide(&change, prefer);
     add(std::move(change), &merge);
   }
-  dropRepeated(&merge);
+  dropRepeated(nullptr, old, latest, &merge);
   return merge;
 }
 

@@ -52,8 +52,8 @@ Merge mergeWithBase(const Content& base, const Content& old, const Content& late
 Merge mergeWithoutBase(const Content& old, const Content& latest, Prefer prefer);
 
 // A name that became the first one is no alias any more, and an attribute type that has to be there
-// is not one that may.
-void dropRepeated(Merge* merge);
+// is not one that may; the clause that loses a member is told. `base` may be null.
+void dropRepeated(const Content* base, const Content& old, const Content& latest, Merge* merge);
 
 // NEW's members in their order and what OLD has beside them, in OLD's order, at the end.
 Values unionOf(const Values& old, const Values& latest);

@@ -83,13 +83,11 @@ Question Questionnaire::about(const Verdict& difference) const {
     Decision decision;
     decision.take = take;
     Choice choice{take, difference};
-    if (tryDecision(decision, *m_result, difference, &choice.after).empty()) {
+    if (tryDecision(decision, m_plan.request, *m_result, difference, &choice.after).empty()) {
       question.choices.push_back(std::move(choice));
     }
   }
-  const bool isCarriedOver = difference.match.latest != nullptr &&
-                             difference.match.latest->file->name.rfind("V3.config.", 0) == 0;
-  if (!isCarriedOver) {
+  if (!difference.isNewsOnly) {
     question.clauses = clausesOf(difference);
     question.mayMove = difference.match.old != nullptr &&
                        difference.kind() != Kind::kVendorExtension &&

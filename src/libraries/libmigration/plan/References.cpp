@@ -2,9 +2,12 @@
 
 #include "References.h"
 
-#include <algorithm>
+#include <array>
+#include <optional>
 #include <unordered_map>
+#include <utility>
 
+#include "Members.h"
 #include "ResultIndex.h"
 #include "RuleSupport.h"
 #include "ThreeWay.h"
@@ -15,8 +18,9 @@ namespace {
 
 class Settling {
  public:
-  explicit Settling(std::vector<Verdict>* differences)
+  Settling(const std::vector<const Entry*>& uncountedOfNew, std::vector<Verdict>* differences)
       : m_rows(*differences), m_ofNew(*differences, ResultIndex::Of::kNew) {
+    m_ofNew.addUncounted(uncountedOfNew);
     for (Verdict& row : m_rows) {
       if (row.match.old != nullptr && row.kind() != Kind::kVendorExtension) {
         for (const std::string& name : row.match.old->kept->object->namesInPlace()) {
@@ -34,10 +38,8 @@ class Settling {
     while (!m_waiting.empty()) {
       Verdict* const row = m_waiting.back();
       m_waiting.pop_back();
-      for (const ReferringAspect& referring : referringAspects(row->kind())) {
-        for (std::string& name : (*row->result)[referring.aspect]) {
-          settle(row, referring, &name);
-        }
+      if (!referringAspects(row->kind()).empty()) {
+        settleAll(row);
       }
     }
   }
@@ -47,34 +49,53 @@ class Settling {
     return static_cast<char>('0' + static_cast<int>(kind)) + name;
   }
 
-  // A name that OLD wrote means what it meant in OLD.
-  void settle(Verdict* row, const ReferringAspect& referring, std::string* name) {
-    if (!isOfOld(*row, referring.aspect, *name)) {
-      return;
+  // A name that OLD wrote means what it meant in OLD; so does one that a person wrote and that
+  // nothing in the result has.
+  void settleAll(Verdict* row) {
+    const Content old = row->match.old == nullptr ? Content() : contentOf(*row->match.old->kept);
+    const bool isText = row->outcome == Outcome::kText;
+    bool isAny = false;
+    for (const ReferringAspect& referring : referringAspects(row->kind())) {
+      const Members ofOld(old[referring.aspect]);
+      for (std::string& name : (*row->result)[referring.aspect]) {
+        const bool isOfOld =
+            ofOld.has(name) || (isText && !isNamedInResult(referring.target, name));
+        isAny = (isOfOld && settle(row, referring, &name)) || isAny;
+      }
     }
+    if (isAny && dropRepeatedReferences(&*row->result)) {
+      row->notes.emplace_back("what it names twice now is named once, in MUST rather than in MAY");
+    }
+  }
+
+  // Whether the name became another one.
+  bool settle(Verdict* row, const ReferringAspect& referring, std::string* name) {
     const auto found = m_byOldName.find(keyOf(referring.target, folded(*name)));
     if (found == m_byOldName.end() || hasInResult(*found->second, *name)) {
-      return;
+      return false;
     }
     Verdict* const meant = found->second;
     if (meant->outcome == Outcome::kDropped && meant->decision.empty()) {
       keep(meant, *row);
-    } else if (meant->isInResult() && !namesInResult(*meant).empty()) {
-      const std::string newName = namesInResult(*meant).front();
-      row->notes.push_back(std::string(nameOf(referring.aspect)) + " names '" + *name +
-                           "', which is called '" + newName +
-                           "' in the result: the reference follows");
-      *name = newName;
-    }
-  }
-
-  static bool isOfOld(const Verdict& row, Aspect aspect, const std::string& name) {
-    if (row.match.old == nullptr) {
       return false;
     }
-    const Content old = contentOf(*row.match.old->kept);
-    return std::any_of(old[aspect].begin(), old[aspect].end(),
-                       [&](const std::string& value) { return equalFolded(value, name); });
+    if (!meant->isInResult() || namesInResult(*meant).empty()) {
+      return false;
+    }
+    const std::string newName = namesInResult(*meant).front();
+    row->notes.push_back(std::string(nameOf(referring.aspect)) + " names '" + *name +
+                         "', which is called '" + newName +
+                         "' in the result: the reference follows");
+    *name = newName;
+    return true;
+  }
+
+  bool isNamedInResult(Kind kind, const std::string& name) {
+    if (!m_ofAll) {
+      m_ofAll.emplace(m_rows, ResultIndex::Of::kAll);
+    }
+    return m_ofAll->byName(kind, name, nullptr) != nullptr ||
+           m_ofAll->byOid(name, nullptr) != nullptr;
   }
 
   static bool hasInResult(const Verdict& meant, const std::string& name) {
@@ -99,7 +120,8 @@ class Settling {
   }
 
   std::vector<Verdict>& m_rows;
-  const ResultIndex m_ofNew;
+  ResultIndex m_ofNew;
+  std::optional<ResultIndex> m_ofAll;  // before anything is kept
   std::unordered_map<std::string, Verdict*> m_byOldName;
   std::vector<Verdict*> m_waiting;
 };
@@ -119,6 +141,10 @@ const std::vector<ReferringAspect>& referringAspects(Kind kind) {
 }
 
 void replaceReferences(const std::vector<Renaming>& renamings, std::vector<Verdict>* differences) {
+  std::array<std::unordered_map<std::string, const Renaming*>, 2> byName;
+  for (const Renaming& renaming : renamings) {
+    byName[static_cast<std::size_t>(renaming.kind)].emplace(folded(renaming.from), &renaming);
+  }
   for (Verdict& row : *differences) {
     if (!row.isCarried() || referringAspects(row.kind()).empty()) {
       continue;
@@ -127,24 +153,21 @@ void replaceReferences(const std::vector<Renaming>& renamings, std::vector<Verdi
     const Content latest =
         row.match.latest == nullptr ? Content() : contentOf(*row.match.latest->kept);
     for (const ReferringAspect& referring : referringAspects(row.kind())) {
+      const Members ofNew(latest[referring.aspect]);
+      const auto& renamed = byName[static_cast<std::size_t>(referring.target)];
       for (std::string& name : (*row.result)[referring.aspect]) {
-        const auto isName = [&](const std::string& value) { return equalFolded(value, name); };
-        const Values& ofNew = latest[referring.aspect];
-        if (std::any_of(ofNew.begin(), ofNew.end(), isName)) {
-          continue;
-        }
-        const auto renaming =
-            std::find_if(renamings.begin(), renamings.end(), [&](const Renaming& each) {
-              return each.kind == referring.target && equalFolded(each.from, name);
-            });
-        if (renaming != renamings.end()) {
-          name = renaming->to;
+        const auto renaming = ofNew.has(name) ? renamed.end() : renamed.find(folded(name));
+        if (renaming != renamed.end()) {
+          name = renaming->second->to;
         }
       }
     }
   }
 }
 
-void settleReferences(std::vector<Verdict>* differences) { Settling(differences).run(); }
+void settleReferences(const std::vector<const Entry*>& uncountedOfNew,
+                      std::vector<Verdict>* differences) {
+  Settling(uncountedOfNew, differences).run();
+}
 
 }  // namespace migration

@@ -19,6 +19,10 @@ struct ReferringAspect {
 // SUP; of classes also MUST and MAY; none of vendor extensions.
 const std::vector<ReferringAspect>& referringAspects(Kind kind);
 
+// A reference that follows a rename can meet one that is there: each stays once, and in MUST rather
+// than in MAY. Whether one went.
+bool dropRepeatedReferences(Content* content);
+
 struct Renaming {
   Kind kind;
   std::string from;  // a name or an OID

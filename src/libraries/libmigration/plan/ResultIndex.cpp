@@ -1,4 +1,6 @@
 #include "ResultIndex.h"
+
+#include "Members.h"
 #include "RuleSupport.h"
 
 namespace migration {
@@ -39,13 +41,12 @@ ResultIndex::ResultIndex(const std::vector<Verdict>& differences, Of which) : m_
 
 void ResultIndex::add(const Verdict& difference) {
   const Entry* const latest = difference.match.latest;
-  const auto isWanted = [&](const Values& ofNew, const std::string& name) {
-    return m_which == Of::kAll ||
-           std::any_of(ofNew.begin(), ofNew.end(),
-                       [&](const std::string& value) { return equalFolded(value, name); });
+  const auto isWanted = [&](const Members& ofNew, const std::string& name) {
+    return m_which == Of::kAll || ofNew.has(name);
   };
   if (difference.kind() == Kind::kVendorExtension) {
-    const Values ofNew = latest == nullptr ? Values() : latest->kept->extension().getDbNames();
+    const Values dbNames = latest == nullptr ? Values() : latest->kept->extension().getDbNames();
+    const Members ofNew(dbNames);
     for (const std::string& name : dbNamesInResult(difference)) {
       if (isWanted(ofNew, name)) {
         m_byDbName.emplace(folded(name), &difference);
@@ -53,7 +54,8 @@ void ResultIndex::add(const Verdict& difference) {
     }
     return;
   }
-  const Values ofNew = latest == nullptr ? Values() : latest->kept->object->namesInPlace();
+  const Values names = latest == nullptr ? Values() : latest->kept->object->namesInPlace();
+  const Members ofNew(names);
   for (const std::string& name : namesInResult(difference)) {
     if (isWanted(ofNew, name)) {
       m_byName[static_cast<std::size_t>(difference.kind())].emplace(folded(name), &difference);
@@ -65,27 +67,43 @@ void ResultIndex::add(const Verdict& difference) {
   }
 }
 
+void ResultIndex::addUncounted(const std::vector<const Entry*>& entries) {
+  for (const Entry* const entry : entries) {
+    if (entry->kind() != Kind::kVendorExtension) {
+      m_uncounted.emplace(oidOf(*entry), entry);
+    }
+  }
+}
+
+const Entry* ResultIndex::uncountedByOid(const std::string& oid) const {
+  const auto found = m_uncounted.find(oid);
+  return found == m_uncounted.end() ? nullptr : found->second;
+}
+
 const Verdict* ResultIndex::findIn(const Index& index, const std::string& key,
-                                   const Verdict* except) {
+                                   const Verdict* except, bool isCarriedOnly) {
   const auto [begin, end] = index.equal_range(key);
   for (auto found = begin; found != end; ++found) {
-    if (found->second != except) {
+    if (found->second != except && (!isCarriedOnly || found->second->isCarried())) {
       return found->second;
     }
   }
   return nullptr;
 }
 
-const Verdict* ResultIndex::byName(Kind kind, std::string_view name, const Verdict* except) const {
-  return findIn(m_byName[static_cast<std::size_t>(kind)], folded(name), except);
+const Verdict* ResultIndex::byName(Kind kind, std::string_view name, const Verdict* except,
+                                   bool isCarriedOnly) const {
+  return findIn(m_byName[static_cast<std::size_t>(kind)], folded(name), except, isCarriedOnly);
 }
 
-const Verdict* ResultIndex::byOid(std::string_view oid, const Verdict* except) const {
-  return findIn(m_byOid, std::string(oid), except);
+const Verdict* ResultIndex::byOid(std::string_view oid, const Verdict* except,
+                                  bool isCarriedOnly) const {
+  return findIn(m_byOid, std::string(oid), except, isCarriedOnly);
 }
 
-const Verdict* ResultIndex::byDbName(std::string_view name, const Verdict* except) const {
-  return findIn(m_byDbName, folded(name), except);
+const Verdict* ResultIndex::byDbName(std::string_view name, const Verdict* except,
+                                     bool isCarriedOnly) const {
+  return findIn(m_byDbName, folded(name), except, isCarriedOnly);
 }
 
 }  // namespace migration

@@ -45,6 +45,8 @@ Side::Side(const Installation& installation) : m_installation(&installation) {
   for (const Entry& entry : installation.entries()) {
     if (countingFor(installation, entry) == &entry) {
       enter(entry);
+    } else {
+      m_uncounted.push_back(&entry);
     }
   }
 }

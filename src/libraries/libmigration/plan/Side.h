@@ -27,6 +27,9 @@ class Side {
   // In the order of reading, by kind.
   const std::vector<const Entry*>& of(Kind kind) const { return m_counting[indexOf(kind)]; }
 
+  // Those of the same that do not count, in the order of reading.
+  const std::vector<const Entry*>& uncounted() const { return m_uncounted; }
+
   // The one that counts with this OID, with this first name in lower case; null when there is none.
   // An empty key finds nothing, and vendor extensions have no names.
   const Entry* byOid(Kind kind, std::string_view oid) const;
@@ -38,6 +41,7 @@ class Side {
 
   const Installation* m_installation;
   std::array<std::vector<const Entry*>, 3> m_counting;
+  std::vector<const Entry*> m_uncounted;
   std::array<std::unordered_map<std::string_view, const Entry*>, 3> m_byOid;
   std::array<std::unordered_map<std::string, const Entry*>, 2> m_byName;
 };

@@ -1,7 +1,6 @@
 #include "Staging.h"
 
 #include <algorithm>
-#include <array>
 #include <functional>
 #include <map>
 #include <string_view>
@@ -10,6 +9,7 @@
 
 #include "References.h"
 #include "ResultIndex.h"
+#include "ResultText.h"
 #include "RuleSupport.h"
 #include "TextEdits.h"
 
@@ -17,30 +17,9 @@ namespace migration {
 
 namespace {
 
-constexpr std::array<const char*, 3> kKeywords = {"attributetypes", "objectclasses",
-                                                  "ORVAttributetypes"};
-
 // Above what is added to a file.
 constexpr std::string_view kHeading =
     "# Carried over from the installation before the migration:\n";
-
-std::string keywordOf(Kind kind) { return kKeywords[static_cast<std::size_t>(kind)]; }
-
-// "(…)" as OLD has it, when the result is just that; as it is composed otherwise.
-std::string textOfResult(const Verdict& row) {
-  const Entry* const old = row.match.old;
-  if (old != nullptr && old->written != nullptr && old->written->isClosed &&
-      contentOf(*old->kept).values == row.result->values) {
-    const WrittenDefinition& written = *old->written;
-    return std::string(
-        old->file->source->bytes().substr(written.offset, written.end - written.offset));
-  }
-  return textOf(*row.result);
-}
-
-std::string lineOf(Kind kind, const std::string& text) {
-  return keywordOf(kind) + "=" + text + "\n";
-}
 
 // The comment lines that stand directly above it in OLD.
 std::string commentsOf(const Verdict& row) {
@@ -49,49 +28,16 @@ std::string commentsOf(const Verdict& row) {
     return "";
   }
   const WrittenDefinition& written = *old->written;
-  std::string comments(old->file->source->bytes().substr(
-      written.commentsBegin, written.commentsEnd - written.commentsBegin));
+  std::string comments =
+      withLineEnds(std::string(old->file->source->bytes().substr(
+                       written.commentsBegin, written.commentsEnd - written.commentsBegin)),
+                   false);
   if (!comments.empty() && comments.back() != '\n') {
     comments += '\n';
   }
   // That of an earlier migration is not the definition's own.
   const std::size_t heading = comments.find(kHeading);
   return heading == std::string::npos ? comments : comments.substr(heading + kHeading.size());
-}
-
-// Whether the library's comparison takes the result for what NEW has, and would leave it out. It
-// looks from one side only, and not at the order of names.
-bool isEqualToTheLibrary(const Verdict& row) {
-  const Source source("result", lineOf(row.kind(), textOf(*row.result)));
-  const KeptFile kept(source);
-  if (kept.definitions().size() != 1) {
-    return false;
-  }
-  const KeptDefinition& mine = kept.definitions().front();
-  const KeptDefinition& theirs = *row.match.latest->kept;
-  switch (row.kind()) {
-    case Kind::kAttributeType:
-      return mine.attribute().isEqualTo(theirs.attribute());
-    case Kind::kObjectClass:
-      return mine.objectClass().isEqualTo(theirs.objectClass());
-    case Kind::kVendorExtension:
-      return mine.extension().isEqualTo(theirs.extension());
-  }
-  return false;
-}
-
-// Whether NEW's definition has to go before the result's can come: the merge replaces only what has
-// the same OID and first name, and the comparison must see a difference.
-bool isInTheWay(const Verdict& row) {
-  if (!row.isCarried() || row.match.latest == nullptr) {
-    return row.isTakenOut;
-  }
-  const Values names = row.result->names();
-  return row.result->oid() != oidOf(*row.match.latest) ||
-         (row.kind() != Kind::kVendorExtension &&
-          (names.empty() ? std::string() : folded(names.front())) !=
-              foldedFirstNameOf(*row.match.latest)) ||
-         isEqualToTheLibrary(row);
 }
 
 // Every definition of NEW that has kind, OID and first name of one that counts: the library writes
@@ -154,15 +100,65 @@ std::string editedText(const SchemaFile& file, const EditsByFile& edits) {
                               : found->second.applyTo(file.source->bytes());
 }
 
-// Where the result has it: NEW's place, that of its attribute type in NEW, or that of an addition.
-std::string fileInResult(const Verdict& row, const std::vector<Verdict>& rows) {
-  if (row.match.latest != nullptr) {
-    return row.match.latest->file->name;
+// Where what is carried stands.
+class Places {
+ public:
+  Places(const Installation& latest, const std::vector<Verdict>& rows)
+      : m_rows(rows), m_repeats(latest) {}
+
+  const std::vector<const Entry*>& repeatsOf(const Verdict& row) const {
+    static const std::vector<const Entry*> kNone;
+    return row.match.latest == nullptr ? kNone : m_repeats.of(*row.match.latest);
   }
-  const bool goesWithNews =
-      row.match.attribute != kNoRow && rows[row.match.attribute].match.latest != nullptr;
-  return goesWithNews ? rows[row.match.attribute].match.latest->file->name : row.file;
-}
+
+  // Of NEW's definitions that have to go, the one in whose place the result stands: the merge puts
+  // an OID into one file alone, an extension where its attribute type is, and nothing into
+  // V3.modifiedschema. Null when none of them will do.
+  const Entry* homeOf(const Verdict& row) const {
+    const std::string file = fileOfType(row);
+    const std::vector<const Entry*>& repeats = repeatsOf(row);
+    const auto home = std::find_if(repeats.begin(), repeats.end(), [&](const Entry* entry) {
+      return file.empty() ? !isModifiedSchema(*entry->file) : entry->file->name == file;
+    });
+    return home == repeats.end() ? nullptr : *home;
+  }
+
+  // Whether it is written behind a file, and not in NEW's place.
+  bool isAddition(const Verdict& row) const {
+    return row.isCarried() &&
+           (row.match.latest == nullptr || (row.isNewsInTheWay && homeOf(row) == nullptr));
+  }
+
+  // NEW's place, that of its attribute type, or that of an addition.
+  std::string fileOf(const Verdict& row) const {
+    if (row.match.latest != nullptr && !row.isNewsInTheWay) {
+      return row.match.latest->file->name;
+    }
+    const std::string file = fileOfType(row);
+    if (!file.empty()) {
+      return file;
+    }
+    if (row.match.latest == nullptr) {
+      return row.file;
+    }
+    const Entry* const home = homeOf(row);
+    return home != nullptr                    ? home->file->name
+           : row.kind() == Kind::kObjectClass ? "V3.user.oc"
+                                              : "V3.user.at";
+  }
+
+ private:
+  // Of a vendor extension whose attribute type is in the result.
+  std::string fileOfType(const Verdict& row) const {
+    if (row.match.attribute == kNoRow || !m_rows[row.match.attribute].isInResult()) {
+      return "";
+    }
+    return fileOf(m_rows[row.match.attribute]);
+  }
+
+  const std::vector<Verdict>& m_rows;
+  Repeats m_repeats;
+};
 
 std::vector<NamedText> textsOf(const std::map<std::string, std::string>& byFile) {
   std::vector<NamedText> texts;
@@ -179,18 +175,22 @@ std::vector<NamedText> textsOf(const std::map<std::string, std::string>& byFile)
 // it refers to as far as that is added to the same file.
 class Additions {
  public:
-  explicit Additions(const std::vector<Verdict>& rows) : m_rows(rows) {
+  Additions(const ThreeWayRequest& request, const std::vector<Verdict>& rows, const Places& places)
+      : m_rows(rows), m_places(places) {
+    for (const SchemaFile& file : request.latest->files()) {
+      m_endsWithReturns[file.name] = endsLinesWithReturns(file.source->bytes());
+    }
     for (std::size_t row = 0; row < rows.size(); ++row) {
       const Verdict& difference = rows[row];
-      if (!isAddition(difference)) {
+      if (!places.isAddition(difference)) {
         continue;
       }
       if (difference.kind() == Kind::kVendorExtension && difference.match.attribute != kNoRow &&
-          isAddition(rows[difference.match.attribute])) {
+          places.isAddition(rows[difference.match.attribute])) {
         m_extensionOf[difference.match.attribute] = row;
         continue;
       }
-      m_byFile[fileInResult(difference, rows)].push_back(row);
+      m_byFile[places.fileOf(difference)].push_back(row);
       for (const std::string& name : difference.result->names()) {
         m_byName.emplace(keyOf(difference.kind(), name), row);
       }
@@ -198,13 +198,14 @@ class Additions {
     }
   }
 
-  // The lines for one file, in their order; empty when nothing is added.
+  // The lines for one file, with those above them, in their order; empty when nothing is added.
   std::string linesFor(const std::string& file) {
     const auto found = m_byFile.find(file);
     if (found == m_byFile.end()) {
       return "";
     }
-    std::string lines;
+    m_areReturns = m_endsWithReturns[file];
+    std::string lines = withLineEnds(std::string(kHeading), m_areReturns);
     for (const std::size_t row : found->second) {
       addWithSuperiors(row, file, &lines);
     }
@@ -220,9 +221,6 @@ class Additions {
   }
 
  private:
-  static bool isAddition(const Verdict& row) {
-    return row.isCarried() && (row.match.latest == nullptr);
-  }
   static std::string keyOf(Kind kind, const std::string& name) {
     return static_cast<char>('0' + static_cast<int>(kind)) + folded(name);
   }
@@ -246,7 +244,7 @@ class Additions {
         const Values& names = (*m_rows[row].result)[referring->aspect];
         for (auto name = names.rbegin(); name != names.rend(); ++name) {
           const auto found = m_byName.find(keyOf(referring->target, *name));
-          if (found != m_byName.end() && fileInResult(m_rows[found->second], m_rows) == file) {
+          if (found != m_byName.end() && m_places.fileOf(m_rows[found->second]) == file) {
             open.emplace_back(found->second, false);
           }
         }
@@ -262,33 +260,39 @@ class Additions {
     }
   }
 
-  static void addLine(const Verdict& row, std::string* lines) {
-    lines->append(commentsOf(row)).append(lineOf(row.kind(), textOfResult(row)));
+  void addLine(const Verdict& row, std::string* lines) const {
+    const std::string line = lineOf(row.kind(), withLineEnds(row.kind(), row.text, m_areReturns));
+    lines->append(withLineEnds(commentsOf(row), m_areReturns))
+        .append(line, 0, line.size() - 1)
+        .append(m_areReturns ? "\r\n" : "\n");
   }
 
   const std::vector<Verdict>& m_rows;
+  const Places& m_places;
   std::map<std::string, std::vector<std::size_t>> m_byFile;
   std::unordered_map<std::size_t, std::size_t> m_extensionOf;
   std::unordered_map<std::string, std::size_t> m_byName;
   std::set<std::size_t> m_done;
+  std::map<std::string, bool> m_endsWithReturns;  // by file
+  bool m_areReturns = false;                      // of the file that lines are made for
 };
 
 }  // namespace
 
 StagedTexts stage(const ThreeWayRequest& request, const ThreeWay& threeWay) {
   const std::vector<Verdict>& rows = threeWay.differences;
-  const Repeats repeats(*request.latest);
+  const Places places(*request.latest, rows);
   std::map<std::string, std::string> old;
   EditsByFile edits;
   for (const Verdict& row : rows) {
     const bool isListed = row.outcome == Outcome::kExcluded || row.outcome == Outcome::kWithdrawn;
     if (row.isCarried()) {
-      old[fileInResult(row, rows)] += lineOf(row.kind(), textOf(*row.result));
+      old[places.fileOf(row)] += lineOf(row.kind(), textOf(*row.result));
     } else if (isListed && row.match.old != nullptr) {
       old[row.match.old->file->name] += lineOf(row.kind(), textOf(contentOf(*row.match.old->kept)));
     }
-    if (row.match.latest != nullptr && isInTheWay(row)) {
-      for (const Entry* const entry : repeats.of(*row.match.latest)) {
+    if (row.match.latest != nullptr && row.isNewsInTheWay) {
+      for (const Entry* const entry : places.repeatsOf(row)) {
         cut(*entry, &edits);
       }
     }
@@ -302,17 +306,20 @@ StagedTexts stage(const ThreeWayRequest& request, const ThreeWay& threeWay) {
 
 std::vector<NamedText> inNewsLayout(const ThreeWayRequest& request, const ThreeWay& threeWay) {
   const std::vector<Verdict>& rows = threeWay.differences;
-  const Repeats repeats(*request.latest);
+  const Places places(*request.latest, rows);
   EditsByFile edits;
   for (const Verdict& row : rows) {
     if (row.match.latest == nullptr) {
       continue;
     }
-    for (const Entry* const entry : repeats.of(*row.match.latest)) {
-      if (row.isCarried()) {
+    const Entry* const home = row.isNewsInTheWay ? places.homeOf(row) : nullptr;
+    for (const Entry* const entry : places.repeatsOf(row)) {
+      if (row.isCarried() && (!row.isNewsInTheWay || entry == home)) {
         const Span span = parenthesesOf(*entry);
-        edits[entry->file].replace(span.begin, span.end, textOfResult(row));
-      } else if (row.isTakenOut) {
+        const bool areReturns = endsLinesWithReturns(entry->file->source->bytes());
+        edits[entry->file].replace(span.begin, span.end,
+                                   withLineEnds(row.kind(), row.text, areReturns));
+      } else if (row.isNewsInTheWay) {
         cut(*entry, &edits);
       }
     }
@@ -321,14 +328,13 @@ std::vector<NamedText> inNewsLayout(const ThreeWayRequest& request, const ThreeW
   for (const SchemaFile& file : request.latest->files()) {
     texts[file.name] = editedText(file, edits);
   }
-  Additions additions(rows);
+  Additions additions(request, rows, places);
   for (const std::string& file : additions.files()) {
     std::string& text = texts[file];
     if (!text.empty() && text.back() != '\n') {
-      text += '\n';
+      text += endsLinesWithReturns(text) ? "\r\n" : "\n";
     }
-    text +=
-        "# Carried over from the installation before the migration:\n" + additions.linesFor(file);
+    text += additions.linesFor(file);
   }
   return textsOf(texts);
 }

@@ -1,7 +1,12 @@
 // What OLD brings that is another definition's in NEW already.
 
 #include <algorithm>
+#include <cstddef>
+#include <string>
+#include <unordered_map>
+#include <vector>
 
+#include "Members.h"
 #include "ResultIndex.h"
 #include "RuleSupport.h"
 #include "ThreeWay.h"
@@ -16,13 +21,11 @@ const Values& dbNamesOf(const Entry& entry) { return entry.kept->extension().get
 // What OLD has beside NEW and, of a definition that NEW has too, beside BASE.
 template <typename Get>
 Values broughtBy(const MatchRow& match, Get valuesOf) {
-  Values brought;
-  for (const std::string& value : valuesOf(*match.old)) {
-    const bool isOfNew = match.latest != nullptr && contains(valuesOf(*match.latest), value);
-    const bool isOfBase =
-        match.latest != nullptr && match.base != nullptr && contains(valuesOf(*match.base), value);
-    if (!isOfNew && !isOfBase) {
-      brought.push_back(value);
+  Values brought = valuesOf(*match.old);
+  if (match.latest != nullptr) {
+    dropMembersOf(valuesOf(*match.latest), &brought);
+    if (match.base != nullptr) {
+      dropMembersOf(valuesOf(*match.base), &brought);
     }
   }
   return brought;
@@ -55,7 +58,12 @@ std::string takenBy(const ResultIndex& index, const Verdict& row) {
     return reason;
   }
   if (bringsItsOid(row.match)) {
-    reason = told("its OID " + oidOf(*row.match.old), index.byOid(oidOf(*row.match.old), &row));
+    const std::string& oid = oidOf(*row.match.old);
+    reason = told("its OID " + oid, index.byOid(oid, &row));
+    const Entry* const uncounted = reason.empty() ? index.uncountedByOid(oid) : nullptr;
+    if (uncounted != nullptr) {
+      reason = "its OID " + oid + " belongs to NEW's " + describeWithPlace(*uncounted);
+    }
   }
   for (const std::string& name : broughtBy(row.match, namesOf)) {
     if (reason.empty()) {
@@ -78,29 +86,143 @@ bool markIfTaken(const ResultIndex& index, Verdict* row) {
   }
   row->outcome = Outcome::kUndecided;
   row->reason = reason;
+  row->decision.clear();
   row->result.reset();
   return true;
 }
 
-void findTakenOfKept(std::vector<Verdict>* differences) {
+Values takenNames(const ResultIndex& index, const Verdict& row) {
+  Values taken;
+  for (const std::string& name : row.match.old->kept->object->namesInPlace()) {
+    if (index.byName(row.kind(), name, &row) != nullptr) {
+      taken.push_back(name);
+    }
+  }
+  return taken;
+}
+
+void findTakenExtensions(std::vector<Verdict>* differences) {
   const ResultIndex index(*differences, ResultIndex::Of::kNew);
   for (Verdict& row : *differences) {
-    if (row.kind() == Kind::kVendorExtension && row.outcome == Outcome::kKept) {
-      markIfTaken(index, &row);
+    const bool isFollower =
+        row.kind() == Kind::kVendorExtension && row.match.attribute != kNoRow && row.isCarried() &&
+        (row.decision.empty() || row.decision == (*differences)[row.match.attribute].decision);
+    if (isFollower) {
+      const bool wasTaken = row.isTaken;
+      row.isTaken = false;
+      row.isTaken = markIfTaken(index, &row) || wasTaken;
     }
   }
 }
 
-// What is taken goes back to NEW's names, which can in turn be what another definition brings.
-void findTaken(std::vector<Verdict>* differences) {
-  for (bool isChanged = true; isChanged;) {
-    isChanged = false;
-    const ResultIndex index(*differences, ResultIndex::Of::kNew);
-    for (Verdict& row : *differences) {
-      isChanged = markIfTaken(index, &row) || isChanged;
+namespace {
+
+// What is taken goes back to NEW's names, which can in turn be what another definition brings:
+// those that bring them are looked at again.
+class Taking {
+ public:
+  Taking(const ThreeWayRequest& request, const std::vector<const Entry*>& uncountedOfNew,
+         std::vector<Verdict>* rows)
+      : m_request(request),
+        m_rows(*rows),
+        m_index(*rows, ResultIndex::Of::kNew),
+        m_extensionOf(rows->size(), kNoRow) {
+    m_index.addUncounted(uncountedOfNew);
+    for (std::size_t row = 0; row < m_rows.size(); ++row) {
+      if (m_rows[row].match.attribute != kNoRow) {
+        m_extensionOf[m_rows[row].match.attribute] = row;
+      }
+      noteBringer(row);
     }
-    joinExtensions(differences);
   }
+
+  void run() {
+    for (std::size_t row = m_rows.size(); row > 0; --row) {
+      m_waiting.push_back(row - 1);
+    }
+    while (!m_waiting.empty()) {
+      const std::size_t row = m_waiting.back();
+      m_waiting.pop_back();
+      if (markIfTaken(m_index, &m_rows[row])) {
+        giveBack(row);
+        joinExtensionOf(row);
+      }
+    }
+  }
+
+ private:
+  static std::string keyOf(char sort, const std::string& text) { return sort + folded(text); }
+  static char sortOf(Kind kind) { return kind == Kind::kAttributeType ? 'a' : 'c'; }
+
+  void noteBringer(std::size_t number) {
+    const Verdict& row = m_rows[number];
+    if (!mayBring(row)) {
+      return;
+    }
+    if (row.kind() == Kind::kVendorExtension) {
+      for (const std::string& name : broughtBy(row.match, dbNamesOf)) {
+        m_bringers.emplace(keyOf('d', name), number);
+      }
+      return;
+    }
+    for (const std::string& name : broughtBy(row.match, namesOf)) {
+      m_bringers.emplace(keyOf(sortOf(row.kind()), name), number);
+    }
+    if (bringsItsOid(row.match)) {
+      m_bringers.emplace(keyOf('o', oidOf(*row.match.old)), number);
+    }
+  }
+
+  void giveBack(std::size_t number) {
+    const Verdict& row = m_rows[number];
+    if (row.match.latest == nullptr) {
+      return;
+    }
+    m_index.add(row);
+    if (row.kind() == Kind::kVendorExtension) {
+      for (const std::string& name : dbNamesOf(*row.match.latest)) {
+        lookAgain(keyOf('d', name));
+      }
+      return;
+    }
+    for (const std::string& name : namesOf(*row.match.latest)) {
+      lookAgain(keyOf(sortOf(row.kind()), name));
+    }
+    lookAgain(keyOf('o', oidOf(*row.match.latest)));
+  }
+
+  void lookAgain(const std::string& key) {
+    const auto [begin, end] = m_bringers.equal_range(key);
+    for (auto bringer = begin; bringer != end; ++bringer) {
+      m_waiting.push_back(bringer->second);
+    }
+  }
+
+  void joinExtensionOf(std::size_t type) {
+    const std::size_t extension = m_extensionOf[type];
+    if (extension == kNoRow) {
+      return;
+    }
+    const bool wasCarried = m_rows[extension].isCarried();
+    joinExtension(m_request, m_rows[type], &m_rows[extension]);
+    if (wasCarried && !m_rows[extension].isCarried()) {
+      giveBack(extension);
+    }
+  }
+
+  const ThreeWayRequest& m_request;
+  std::vector<Verdict>& m_rows;
+  ResultIndex m_index;
+  std::vector<std::size_t> m_extensionOf;  // by the row of the attribute type
+  std::unordered_multimap<std::string, std::size_t> m_bringers;
+  std::vector<std::size_t> m_waiting;
+};
+
+}  // namespace
+
+void findTaken(const ThreeWayRequest& request, const std::vector<const Entry*>& uncountedOfNew,
+               std::vector<Verdict>* differences) {
+  Taking(request, uncountedOfNew, differences).run();
 }
 
 }  // namespace migration

@@ -33,6 +33,13 @@ std::string suspiciousBase(const Rows& rows) {
                                                                         : "";
 }
 
+// BASE's reference may follow a rename.
+bool isEqualToBase(const Verdict& row, const Entry* other) {
+  return row.followedBase == nullptr || other == nullptr
+             ? areEqual(row.match.base, other)
+             : migration::areEqual(*row.followedBase, contentOf(*other->kept));
+}
+
 // Whether the second is a definition of the first under another name or another OID.
 void noteIdentity(const Entry* left, const Entry* right, Verdict* row) {
   if (left == nullptr || right == nullptr || row->kind() == Kind::kVendorExtension) {
@@ -44,13 +51,10 @@ void noteIdentity(const Entry* left, const Entry* right, Verdict* row) {
   row->isRenumbered = !isSameOid && isSameName;
 }
 
-// The clauses that changed between two that are both there.
-void noteChanges(const Entry* from, const Entry* to, Values ClauseChange::*target, Verdict* row) {
-  if (from == nullptr || to == nullptr) {
-    return;
-  }
-  const Content before = contentOf(*from->kept);
-  const Content after = contentOf(*to->kept);
+// The clauses that changed from BASE.
+void noteChanges(const Entry& to, Values ClauseChange::*target, Verdict* row) {
+  const Content before = baseContentOf(*row);
+  const Content after = contentOf(*to.kept);
   for (const Aspect aspect : aspectsOf(before.kind)) {
     if (!areEqual(aspect, before[aspect], after[aspect])) {
       ClauseChange change;
@@ -105,19 +109,19 @@ void take(Merge merge, Verdict* row) {
   }
 }
 
-Merge mergeOf(const MatchRow& match, Prefer prefer) {
-  const Content old = contentOf(*match.old->kept);
-  const Content latest = contentOf(*match.latest->kept);
-  return match.base == nullptr ? mergeWithoutBase(old, latest, prefer)
-                               : mergeWithBase(contentOf(*match.base->kept), old, latest, prefer);
+Merge mergeOf(const Verdict& row, Prefer prefer) {
+  const Content old = contentOf(*row.match.old->kept);
+  const Content latest = contentOf(*row.match.latest->kept);
+  return row.match.base == nullptr ? mergeWithoutBase(old, latest, prefer)
+                                   : mergeWithBase(baseContentOf(row), old, latest, prefer);
 }
 
 // ---- One definition, by who has it ----
 
 void classifyInAll(Verdict* row) {
   const MatchRow& match = row->match;
-  const bool isSites = !areEqual(match.base, match.old);
-  const bool isReleases = !areEqual(match.base, match.latest);
+  const bool isSites = !isEqualToBase(*row, match.old);
+  const bool isReleases = !isEqualToBase(*row, match.latest);
   if (!isSites && !isReleases) {
     set(Change::kSame, Outcome::kSame, "nobody changed it", row);
     return;
@@ -126,7 +130,7 @@ void classifyInAll(Verdict* row) {
     set(Change::kSame, Outcome::kSame, "the site and the release changed it alike", row);
     return;
   }
-  take(mergeOf(match, Prefer::kNothing), row);
+  take(mergeOf(*row, Prefer::kNothing), row);
   if (!isSites) {
     set(Change::kChangedByRelease, Outcome::kNew, "only the release changed it", row);
     row->result.reset();
@@ -148,7 +152,7 @@ void classifyAddedByBoth(bool hasBase, Verdict* row) {
         hasBase ? "the site and the release added it alike" : "OLD and NEW define it alike", row);
     return;
   }
-  take(mergeOf(row->match, Prefer::kNothing), row);
+  take(mergeOf(*row, Prefer::kNothing), row);
   const Outcome outcome = row->outcome;
   if (!hasBase) {
     set(Change::kUnknown, outcome,
@@ -179,8 +183,8 @@ void classifyNewOnly(bool hasBase, Verdict* row) {
 }
 
 void classifyRemovedByRelease(Verdict* row) {
-  noteChanges(row->match.base, row->match.old, &ClauseChange::old, row);
-  const bool isUnchanged = areEqual(row->match.base, row->match.old);
+  noteChanges(*row->match.old, &ClauseChange::old, row);
+  const bool isUnchanged = isEqualToBase(*row, row->match.old);
   set(Change::kRemovedByRelease, isUnchanged ? Outcome::kDropped : Outcome::kUndecided,
       isUnchanged ? "the release removed it, and the site had not changed it"
                   : "the release removed it, and the site had changed it",
@@ -189,7 +193,7 @@ void classifyRemovedByRelease(Verdict* row) {
 }
 
 void classifyRemovedBySite(Verdict* row) {
-  noteChanges(row->match.base, row->match.latest, &ClauseChange::latest, row);
+  noteChanges(*row->match.latest, &ClauseChange::latest, row);
   set(Change::kRemovedBySite, Outcome::kNew, "the site removed it; the release still has it", row);
   row->risk = Risk::kData;
 }
@@ -210,20 +214,6 @@ void classifyOne(bool hasBase, Verdict* row) {
 
 // ---- What holds beside the classes ----
 
-// The library writes no config file, so that what stands only there can only be NEW's.
-void keepConfigFile(Verdict* row) {
-  const MatchRow& match = row->match;
-  if (match.latest == nullptr || match.old == nullptr || !isConfigFile(*match.latest->file) ||
-      row->change == Change::kSame || row->change == Change::kChangedByRelease) {
-    return;
-  }
-  row->outcome = Outcome::kUndecided;
-  row->result.reset();
-  row->reason = "NEW has it only in " + match.latest->file->name +
-                ", which is carried over as it is, and " +
-                (row->change == Change::kUnknown ? "OLD's differs" : "the site changed it");
-}
-
 // The library writes a vendor extension behind its attribute type alone.
 void leaveOutOrphan(Verdict* row) {
   if (row->kind() == Kind::kVendorExtension && row->match.attribute == kNoRow &&
@@ -233,48 +223,6 @@ void leaveOutOrphan(Verdict* row) {
     row->result.reset();
   }
 }
-
-// Nor can a vendor extension be written beside an attribute type that stands only there.
-void keepConfigFileOfType(const Rows& rows, Verdict* row) {
-  if (row->kind() != Kind::kVendorExtension || row->match.attribute == kNoRow ||
-      !row->isCarried()) {
-    return;
-  }
-  const Entry* const type = rows[row->match.attribute].match.latest;
-  if (type != nullptr && isConfigFile(*type->file)) {
-    row->outcome = Outcome::kUndecided;
-    row->result.reset();
-    row->reason = "NEW has its attribute type only in " + type->file->name +
-                  ", which is carried over as it is";
-  }
-}
-
-// The file whose set the merge puts an OID of OLD into: the first of these that has it.
-class FilesOfAdditions {
- public:
-  explicit FilesOfAdditions(const Installation& old) {
-    for (const char* const name :
-         {"V3.user.oc", "V3.user.at", "V3.orv.oc", "V3.orv.at", "V3.system.oc", "V3.system.at"}) {
-      if (const SchemaFile* const file = old.file(name)) {
-        for (const KeptDefinition& definition : file->kept->definitions()) {
-          if (definition.isEntered) {
-            m_files.emplace(definition.object->oidInPlace(), name);
-          }
-        }
-      }
-    }
-  }
-
-  const char* of(const Entry& entry) const {
-    const auto found = m_files.find(oidOf(entry));
-    return found != m_files.end()               ? found->second
-           : entry.kind() == Kind::kObjectClass ? "V3.user.oc"
-                                                : "V3.user.at";
-  }
-
- private:
-  std::unordered_map<std::string_view, const char*> m_files;
-};
 
 void leaveOut(Outcome outcome, const char* reason, Verdict* row) {
   row->outcome = outcome;
@@ -303,39 +251,66 @@ void classify(const ThreeWayRequest& request, Rows* rows) {
     noteIdentity(row.match.old != nullptr ? row.match.old : row.match.base,
                  row.match.latest != nullptr ? row.match.latest : row.match.base, &row);
     classifyOne(request.base != nullptr, &row);
-    keepConfigFile(&row);
     leaveOutOrphan(&row);
   }
-  for (Verdict& row : *rows) {
-    keepConfigFileOfType(*rows, &row);
+}
+
+bool isOpenToPreference(const Verdict& row) {
+  const MatchRow& match = row.match;
+  return match.old != nullptr && match.latest != nullptr && !row.isTaken && !row.isNewsOnly &&
+         (row.kind() == Kind::kVendorExtension || oidOf(*match.old) == oidOf(*match.latest));
+}
+
+namespace {
+
+void preferSide(const ThreeWayRequest& request, Verdict* row) {
+  const bool wasUndecided = row->isUndecided();
+  row->notes.clear();
+  take(mergeOf(*row, request.prefer), row);
+  if (wasUndecided) {
+    row->reason += request.prefer == Prefer::kOld ? "; OLD's is preferred" : "; NEW's is preferred";
   }
 }
+
+bool isAskedAbout(const Verdict& row) {
+  return row.change == Change::kInConflict || row.change == Change::kMergeable ||
+         row.change == Change::kUnknown;
+}
+
+}  // namespace
 
 void applyPreference(const ThreeWayRequest& request, Rows* rows) {
   if (request.prefer == Prefer::kNothing) {
     return;
   }
   for (Verdict& row : *rows) {
-    const bool isAsked = row.change == Change::kInConflict || row.change == Change::kMergeable ||
-                         row.change == Change::kUnknown;
-    const MatchRow& match = row.match;
-    if (!isAsked || match.old == nullptr || match.latest == nullptr ||
-        row.outcome == Outcome::kExcluded || row.outcome == Outcome::kWithdrawn || row.isTaken ||
-        isConfigFile(*match.latest->file) ||
-        (row.kind() != Kind::kVendorExtension && oidOf(*match.old) != oidOf(*match.latest))) {
-      continue;
-    }
-    const bool wasUndecided = row.isUndecided();
-    row.notes.clear();
-    take(mergeOf(match, request.prefer), &row);
-    if (wasUndecided) {
-      row.reason +=
-          request.prefer == Prefer::kOld ? "; OLD's is preferred" : "; NEW's is preferred";
+    if (isAskedAbout(row) && isOpenToPreference(row) && row.outcome != Outcome::kExcluded &&
+        row.outcome != Outcome::kWithdrawn) {
+      preferSide(request, &row);
     }
   }
 }
 
+void judgeAlone(const ThreeWayRequest& request, Verdict* row) {
+  row->clauses.clear();
+  row->notes.clear();
+  classifyOne(request.base != nullptr, row);
+  if (request.prefer != Prefer::kNothing && isAskedAbout(*row) && isOpenToPreference(*row)) {
+    preferSide(request, row);
+  }
+}
+
 namespace {
+
+// What came to be NEW's, by references that follow, is NEW's.
+void giveToNew(Verdict* row) {
+  const bool isMerged = row->outcome == Outcome::kOld || row->outcome == Outcome::kMerged;
+  if (isMerged && row->isCarried() && row->match.latest != nullptr &&
+      row->result->values == contentOf(*row->match.latest->kept).values) {
+    row->result.reset();
+    row->outcome = row->decision.empty() ? Outcome::kNew : row->outcome;
+  }
+}
 
 // What the clauses come to is what stands in the result, whoever decided it.
 void showResult(Verdict* row) {
@@ -369,26 +344,28 @@ ThreeWay compareThreeWay(const ThreeWayRequest& request) {
   if (base) {
     result.suspiciousBase = suspiciousBase(rows);
   }
+  result.uncountedOfNew = latest.uncounted();
+  followSharedRenames(&rows);
   classify(request, &rows);
-  joinExtensions(&rows);
-  findTaken(&rows);
+  keepNewsOwn(*request.latest, result.uncountedOfNew, &rows);
+  joinExtensions(request, &rows);
+  findTaken(request, result.uncountedOfNew, &rows);
+  findDoubled(request, &rows);
+  noteExtensions(&rows);
   applyLists(request, &rows);
   applyPreference(request, &rows);
-  applyDecisions(request.decisions, request.allowUnused, &rows, &result.failures);
-  joinExtensions(&rows);
-  settleReferences(&rows);
-  joinExtensions(&rows);
-  findTakenOfKept(&rows);
+  applyDecisions(request, &rows, &result.failures);
+  joinExtensions(request, &rows);
+  settleReferences(result.uncountedOfNew, &rows);
+  joinExtensions(request, &rows);
+  findTakenExtensions(&rows);
   followOids(&rows);
   for (Verdict& row : rows) {
+    giveToNew(&row);
     showResult(&row);
   }
-  const FilesOfAdditions files(*request.old);
-  for (Verdict& row : rows) {
-    if (row.isCarried() && row.match.latest == nullptr) {
-      row.file = files.of(row.entry());
-    }
-  }
+  placeAdditions(*request.old, &rows);
+  writeTexts(&rows);
   return result;
 }
 

@@ -13,53 +13,83 @@ bool goesWithItsAttribute(const Verdict& type) {
          !type.isInResult();
 }
 
-bool isDecidedItself(const Verdict& extension, const std::vector<Verdict>& differences) {
-  return !extension.decision.empty() &&
-         extension.decision != differences[extension.match.attribute].decision;
+bool isDecidedItself(const Verdict& type, const Verdict& extension) {
+  return !extension.decision.empty() && extension.decision != type.decision;
 }
 
-void follow(const Verdict& type, Verdict* extension) {
-  const MatchRow& match = extension->match;
-  extension->reason = "goes with its attribute type: " + type.reason;
-  extension->result.reset();
-  if (type.isTaken && match.old != nullptr) {
+void noteTaken(const Verdict& type, Verdict* extension) {
+  if (type.isTaken && extension->match.old != nullptr) {
     extension->isTaken = true;
     extension->change = type.change;
   }
+}
+
+// Of what OLD and NEW both have, a decision may take clauses of both; then the extension is no
+// less judged by itself.
+bool isDecidedByClauses(const Verdict& type) {
+  return !type.decision.empty() && type.match.old != nullptr && type.match.latest != nullptr &&
+         (type.outcome == Outcome::kMerged || type.outcome == Outcome::kText);
+}
+
+void follow(const ThreeWayRequest& request, const Verdict& type, Verdict* extension) {
+  const MatchRow& match = extension->match;
+  extension->result.reset();
+  if (isDecidedByClauses(type)) {
+    extension->isTaken = false;
+    judgeAlone(request, extension);
+    return;
+  }
+  extension->reason = "goes with its attribute type: " + type.reason;
+  noteTaken(type, extension);
+  extension->decision = type.decision;
   if (type.isTakenOut) {
     extension->outcome = Outcome::kDropped;
     extension->isTakenOut = true;
-    extension->decision = type.decision;
     return;
   }
+  extension->isTakenOut = false;
   if (match.old == nullptr) {
     // Nothing of the site's is asked about.
     extension->outcome = match.latest != nullptr ? Outcome::kNew : Outcome::kGone;
+    extension->decision.clear();
     return;
   }
   extension->outcome = type.outcome;
-  extension->isTakenOut = type.isTakenOut;
-  extension->decision = type.decision;
   if (type.isCarried()) {
     extension->result = contentOf(*match.old->kept);
     (*extension->result)[Aspect::kOid] = {type.result->oid()};
+    if (type.outcome == Outcome::kText) {
+      extension->outcome = match.latest == nullptr ? Outcome::kAdded : Outcome::kOld;
+    }
   }
 }
 
 }  // namespace
 
-void joinExtensions(std::vector<Verdict>* differences) {
+void joinExtension(const ThreeWayRequest& request, const Verdict& type, Verdict* row) {
+  // One whose own DBNAME is taken stays so.
+  const bool isTakenItself = row->isTaken && !type.isTaken && type.isInResult();
+  if (row->outcome != Outcome::kExcluded && row->outcome != Outcome::kWithdrawn &&
+      !isDecidedItself(type, *row) && goesWithItsAttribute(type) && !isTakenItself) {
+    follow(request, type, row);
+  }
+}
+
+void joinExtensions(const ThreeWayRequest& request, std::vector<Verdict>* differences) {
   for (Verdict& row : *differences) {
-    if (row.kind() != Kind::kVendorExtension || row.match.attribute == kNoRow ||
-        row.outcome == Outcome::kExcluded || row.outcome == Outcome::kWithdrawn ||
-        isDecidedItself(row, *differences)) {
-      continue;
+    if (row.kind() == Kind::kVendorExtension && row.match.attribute != kNoRow) {
+      joinExtension(request, (*differences)[row.match.attribute], &row);
     }
-    const Verdict& type = (*differences)[row.match.attribute];
-    // One whose own DBNAME is taken stays so.
-    const bool isTakenItself = row.isTaken && !type.isTaken && type.isInResult();
-    if (goesWithItsAttribute(type) && !isTakenItself) {
-      follow(type, &row);
+  }
+}
+
+void noteExtensions(std::vector<Verdict>* differences) {
+  for (const Verdict& row : *differences) {
+    if (row.kind() == Kind::kVendorExtension && row.match.attribute != kNoRow) {
+      Verdict& type = (*differences)[row.match.attribute];
+      if (goesWithItsAttribute(type)) {
+        type.extensions = {row.match.base, row.match.old, row.match.latest};
+      }
     }
   }
 }

@@ -39,6 +39,11 @@ const Entry& Verdict::entry() const {
   return newer != nullptr ? *newer : *match.base;
 }
 
+Content baseContentOf(const Verdict& difference) {
+  return difference.followedBase != nullptr ? *difference.followedBase
+                                            : contentOf(*difference.match.base->kept);
+}
+
 std::string describe(const Verdict& difference) { return describe(*difference.entry().kept); }
 
 }  // namespace migration

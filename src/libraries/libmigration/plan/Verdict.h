@@ -4,8 +4,10 @@
 #ifndef LIBSCHEMA_MIGRATION_VERDICT_H
 #define LIBSCHEMA_MIGRATION_VERDICT_H
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -64,6 +66,9 @@ struct Verdict {
   bool isRenamed = false;          // OLD and NEW: one OID, two first names
   bool isRenumbered = false;       // one first name, two OIDs
   bool isTaken = false;            // also where the change is unknown
+  bool isNewsOnly = false;         // nothing but NEW's can be taken
+  // A definition of NEW that would count if this one went, or got another OID or first name.
+  const Entry* behind = nullptr;
   Risk risk = Risk::kNone;
   std::vector<ClauseChange> clauses;
   // What stands in the result where it is not simply NEW's: of kOld, kMerged, kAdded, kKept, kText.
@@ -71,6 +76,15 @@ struct Verdict {
   std::string file;         // where the result goes when NEW does not have it: "V3.user.at"
   bool isTakenOut = false;  // a decision drops what NEW has
   std::string decision;     // where the decision about it stands, "FILE:LINE"; mostly empty
+  // Whether NEW's has to go before the result's can come, instead of being replaced.
+  bool isNewsInTheWay = false;
+  // Of what is carried: its definition as it stands in NEW's layout, from "(" to ")".
+  std::string text;
+
+  // BASE's, where references in it follow a rename that OLD and NEW share; mostly null.
+  std::shared_ptr<const Content> followedBase;
+  // Of an attribute type whose vendor extension goes with it: that of BASE, OLD and NEW, or null.
+  std::array<const Entry*, 3> extensions{};
 
   Kind kind() const { return match.kind; }
   // The definition by which it is called: OLD's, or NEW's, or BASE's.
@@ -81,6 +95,9 @@ struct Verdict {
   // Whether the result has a definition at all.
   bool isInResult() const { return isCarried() || (match.latest != nullptr && !isTakenOut); }
 };
+
+// BASE's content, which must be there, as it is to be compared with OLD's and NEW's.
+Content baseContentOf(const Verdict& difference);
 
 // "attribute type cn (2.5.4.3)", by its first name and OID as entry() has them.
 std::string describe(const Verdict& difference);
