@@ -144,7 +144,8 @@ const Inputs kConflict = {oc("2.1 NAME 'c' SUP p ABSTRACT MAY ( x )"),
                           oc("2.1 NAME 'c' SUP r ABSTRACT MAY ( x $ n )")};
 
 // The definitions that are not the same, with what is wrong.
-std::string decided(const Inputs& inputs, const std::string& toml, bool allowUnused = false) {
+std::string decided(const Inputs& inputs, const std::string& toml, bool allowUnused = false,
+                    migration::Prefer prefer = migration::Prefer::kNothing) {
   const Installation base = installationOf("BASE", inputs.base);
   const Installation old = installationOf("OLD", inputs.old);
   const Installation latest = installationOf("NEW", inputs.latest);
@@ -153,6 +154,7 @@ std::string decided(const Inputs& inputs, const std::string& toml, bool allowUnu
   request.old = &old;
   request.latest = &latest;
   request.allowUnused = allowUnused;
+  request.prefer = prefer;
   const migration::Source source("d.toml", toml);
   migration::Failures malformed;
   readDecisions(source, &request.decisions, &malformed);
@@ -446,6 +448,123 @@ TEST(Decisions, TheFingerprintOfWhatIsRenamedBesideNewsIsThatOfBoth) {
                                 "rename = 'siteBadge'\nfingerprint = '" + fingerprint + "'"));
   EXPECT_EQ(outcome, decided(renumbered, about("attribute-type", "badge", "rename = 'siteBadge'")));
   EXPECT_EQ(outcome.find("d.toml:1: "), std::string::npos) << outcome;
+}
+
+TEST(Decisions, AFingerprintCoversTheExtensionThatGoesWithTheAttributeType) {
+  const auto fingerprint = [](const Inputs& inputs) {
+    const Installation base = installationOf("BASE", inputs.base);
+    const Installation old = installationOf("OLD", inputs.old);
+    const Installation latest = installationOf("NEW", inputs.latest);
+    ThreeWayRequest request;
+    request.base = &base;
+    request.old = &old;
+    request.latest = &latest;
+    return fingerprintOf(compareThreeWay(request).differences.front());
+  };
+  const std::string type = at("9.1 NAME 'badge' USAGE u");
+  const std::string first = orv("9.1 DBNAME ( 'b' )");
+  const std::string other = orv("9.1 DBNAME ( 'c' )");
+  EXPECT_NE(fingerprint({"", type + first, ""}), fingerprint({"", type + other, ""}));
+  EXPECT_EQ(fingerprint({"", type + first, type + first}),
+            fingerprint({"", type + other, type + first}));
+}
+
+// A decision made for what is split then is no less fresh.
+TEST(Decisions, RenameBesideNewsTakesItsFingerprint) {
+  const Inputs inputs = {"", at("9.1 NAME 'badge' USAGE u"), at("1.5 NAME 'badge' USAGE v")};
+  const Installation base = installationOf("BASE", inputs.base);
+  const Installation old = installationOf("OLD", inputs.old);
+  const Installation latest = installationOf("NEW", inputs.latest);
+  ThreeWayRequest request;
+  request.base = &base;
+  request.old = &old;
+  request.latest = &latest;
+  const std::string fingerprint = fingerprintOf(compareThreeWay(request).differences.front());
+  EXPECT_EQ(decided(inputs, about("attribute-type", "badge",
+                                  "rename = 'mine'\nfingerprint = '" + fingerprint + "'")),
+            "attribute type badge (1.5) -> new\n"
+            "attribute type badge (9.1) -> added by d.toml:1 ( 9.1 NAME ( 'mine' ) USAGE u )\n");
+}
+
+TEST(Decisions, WhatClausesDoNotNameIsDecidedByThePreference) {
+  const Inputs inputs = {at("1.1 NAME 'a' SUP p SYNTAX 1.2 USAGE u"),
+                         at("1.1 NAME 'a' SUP q SYNTAX 1.3 USAGE u"),
+                         at("1.1 NAME 'a' SUP r SYNTAX 1.4 USAGE u")};
+  const std::string toml = about("attribute-type", "a", "clauses = { SUP = 'new' }");
+  EXPECT_EQ(decided(inputs, toml),
+            "attribute type a (1.1) -> undecided\n"
+            "d.toml:1: the decision about attribute type a (1.1) cannot be carried out: it leaves "
+            "undecided: MATCHING\n");
+  EXPECT_EQ(decided(inputs, toml, false, migration::Prefer::kOld),
+            "attribute type a (1.1) -> merged by d.toml:1 ( 1.1 NAME ( 'a' ) SUP r SYNTAX 1.3 "
+            "USAGE u )\n");
+}
+
+TEST(Decisions, ARenameGivesUpTheAliasThatIsTaken) {
+  const Inputs inputs = {"",
+                         at("9.1 NAME ( 'mine' 'badge' 'other' ) USAGE u") +
+                             oc("9.3 NAME 'guard' ABSTRACT MUST ( badge ) MAY ( other )"),
+                         at("1.5 NAME 'badge' USAGE v")};
+  EXPECT_EQ(decided(inputs, about("attribute-type", "mine", "rename = 'mine'")),
+            "attribute type badge (1.5) -> new\n"
+            "attribute type mine (9.1) -> added by d.toml:1 ( 9.1 NAME ( 'mine' 'other' ) USAGE u "
+            ")\n"
+            "object class guard (9.3) -> added ( 9.3 NAME ( 'guard' ) ABSTRACT MUST ( mine ) MAY ( "
+            "other ) )\n");
+}
+
+// The extension that comes with what is renamed can still clash.
+TEST(Decisions, ADbNameThatStaysTakenIsUndecided) {
+  const Inputs inputs = {"", at("9.1 NAME 'badge' USAGE u") + orv("9.1 DBNAME ( 'b' )"),
+                         at("1.5 NAME 'badge' USAGE v") + orv("1.5 DBNAME ( 'b' )")};
+  const std::string rename = about("attribute-type", "badge", "rename = 'mine'");
+  EXPECT_EQ(decided(inputs, rename),
+            "attribute type badge (1.5) -> new\n"
+            "vendor extension 1.5 -> new\n"
+            "attribute type badge (9.1) -> added by d.toml:1 ( 9.1 NAME ( 'mine' ) USAGE u )\n"
+            "vendor extension 9.1 -> undecided\n");
+  EXPECT_EQ(decided(inputs, rename + "[[definition]]\nkind='vendor-extension'\noid='9.1'\n"
+                                     "text=\"( 9.1 DBNAME ( 'mine' ) )\"\n"),
+            "attribute type badge (1.5) -> new\n"
+            "vendor extension 1.5 -> new\n"
+            "attribute type badge (9.1) -> added by d.toml:1 ( 9.1 NAME ( 'mine' ) USAGE u )\n"
+            "vendor extension 9.1 -> text by d.toml:5 ( 9.1 DBNAME ( 'mine' ) ACCESS-CLASS normal "
+            ")\n");
+}
+
+TEST(Decisions, ATakenTypeDecidedByClausesLeavesItsExtensionToItself) {
+  const std::string plain = at("1.1 NAME 'a' USAGE u") + orv("1.1 DBNAME ( 'a' ) LENGTH 8");
+  const Inputs inputs = {
+      plain, at("1.1 NAME ( 'a' 'badge' ) USAGE u") + orv("1.1 DBNAME ( 'a' ) LENGTH 8"),
+      at("1.1 NAME 'a' USAGE u") + orv("1.1 DBNAME ( 'a' ) LENGTH 9") +
+          at("1.5 NAME 'badge' USAGE v")};
+  EXPECT_EQ(decided(inputs, about("attribute-type", "a", "text = \"( 1.1 NAME 'a' USAGE w )\"")),
+            "attribute type a (1.1) -> text by d.toml:1 ( 1.1 NAME ( 'a' ) USAGE w )\n"
+            "attribute type badge (1.5) -> new\n"
+            "vendor extension 1.1 -> new\n");
+}
+
+TEST(Decisions, WhatIsKeptFollowsARename) {
+  const std::string shipped = at("1.1 NAME 'k' SUP badge USAGE u");
+  const Inputs inputs = {
+      shipped, shipped + at("9.1 NAME 'badge' USAGE u") + oc("9.2 NAME 'guard' ABSTRACT MAY ( k )"),
+      ""};
+  EXPECT_EQ(decided(inputs, about("attribute-type", "badge", "rename = 'mine'")),
+            "attribute type k (1.1) -> kept ( 1.1 NAME ( 'k' ) SUP mine USAGE u )\n"
+            "attribute type badge (9.1) -> added by d.toml:1 ( 9.1 NAME ( 'mine' ) USAGE u )\n"
+            "object class guard (9.2) -> added ( 9.2 NAME ( 'guard' ) ABSTRACT MAY ( k ) )\n");
+}
+
+TEST(Decisions, AnExtensionWithoutItsAttributeTypeIsRefused) {
+  const Inputs inputs = {"", at("9.1 NAME 'badge' USAGE u") + orv("9.1 DBNAME ( 'b' )"), ""};
+  EXPECT_EQ(
+      decided(inputs, about("attribute-type", "badge", "take = 'drop'") +
+                          "[[definition]]\nkind='vendor-extension'\noid='9.1'\n"
+                          "take='old'\n"),
+      "attribute type badge (9.1) -> dropped by d.toml:1, taken out\n"
+      "vendor extension 9.1 -> added by d.toml:5 ( 9.1 DBNAME ( 'b' ) ACCESS-CLASS normal )\n"
+      "d.toml:5: the decision about vendor extension 9.1 cannot be carried out: its attribute "
+      "type is not in the result\n");
 }
 
 TEST(Decisions, OneDecisionCoversAnAttributeTypeAndItsExtension) {

@@ -162,6 +162,87 @@ TEST(Execution, WhatTheLibrarysWriterDoesNotCarryIsNamed) {
             "result: vendor extension 1.1 is not in the result\n");
 }
 
+// What NEW has twice is NEW's own: its layout keeps it, and only the library's cannot.
+TEST(Execution, NewsOwnRepeatsStay) {
+  const std::string type = "attributetypes=( 1.1 NAME 'a' USAGE u )\n";
+  const struct {
+    const char* rule;
+    std::string latest;
+    const char* notCarried;
+  } cases[] = {
+      {"TwoUnderOneOid", type + "attributetypes=( 1.1 NAME 'b' USAGE u )\n",
+       "result: attribute type b (1.1) is not in the result\n"},
+      {"TwoUnderOneFirstName", type + "attributetypes=( 1.2 NAME 'A' USAGE v )\n", ""},
+      {"TwoUnderOneFirstNameThatTheLibraryWouldTurnRound",
+       "attributetypes=( 1.2 NAME 'A' USAGE v )\n" + type,
+       "result: attribute type A (1.2) is not in the result\n"},
+      {"TwoUnderBoth", type + "attributetypes=( 1.1 NAME 'a' USAGE v )\n",
+       "result: attribute type a (1.1) of V3.system.at:2 in NEW is not in the result\n"},
+      {"TwoAlike", type + type, ""},
+  };
+  const std::string sites = "attributetypes=( 9.1 NAME 'mine' USAGE u )\n";
+  for (const auto& row : cases) {
+    SCOPED_TRACE(row.rule);
+    const std::vector<NamedText> latest = {{"V3.system.at", row.latest}};
+    const Outcome result =
+        run(latest, {{"V3.system.at", row.latest}, {"V3.user.at", sites}}, latest);
+    EXPECT_EQ(textOf(result.execution.failures), "");
+    EXPECT_EQ(textOf(result.execution.inNewsLayout),
+              "== V3.system.at\n" + row.latest +
+                  "== V3.user.at\n# Carried over from the installation before the migration:\n" +
+                  sites);
+    EXPECT_EQ(textOf(result.execution.notCarriedByLibrary), row.notCarried);
+  }
+}
+
+// A definition of which a repeat lies in another file gets the site's OID or name in one place.
+TEST(Execution, ARepeatGoesWithWhatIsRenumbered) {
+  const std::string plain = "attributetypes=( 1.1 NAME 'a' USAGE u )\n";
+  const std::vector<NamedText> shipped = {{"V3.system.at", plain}, {"V3.user.at", plain}};
+  const Outcome result =
+      run(shipped, {{"V3.user.at", "attributetypes=( 9.1 NAME 'a' USAGE u )\n"}}, shipped);
+  EXPECT_EQ(textOf(result.execution.failures), "");
+  EXPECT_EQ(textOf(result.execution.inNewsLayout),
+            "== V3.system.at\nattributetypes=( 9.1 NAME 'a' USAGE u )\n== V3.user.at\n");
+}
+
+TEST(Execution, WhatIsAddedTakesTheLineEndsOfItsFile) {
+  const std::string first = "attributetypes=( 1.1 NAME 'a' USAGE u )";
+  const std::string own = "attributetypes=( 9.1 NAME 'b' USAGE u )";
+  const Outcome toReturns =
+      run({{"V3.user.at", first + "\r\n"}}, {{"V3.user.at", first + "\n# ours\n" + own + "\n"}},
+          {{"V3.user.at", first + "\r\n"}});
+  EXPECT_EQ(textOf(toReturns.execution.failures), "");
+  EXPECT_EQ(textOf(toReturns.execution.inNewsLayout),
+            "== V3.user.at\n" + first +
+                "\r\n# Carried over from the installation before the migration:\r\n# ours\r\n" +
+                own + "\r\n");
+  const Outcome fromReturns =
+      run({{"V3.user.at", first + "\n"}}, {{"V3.user.at", first + "\r\n# ours\r\n" + own + "\r\n"}},
+          {{"V3.user.at", first + "\n"}});
+  EXPECT_EQ(textOf(fromReturns.execution.failures), "");
+  EXPECT_EQ(textOf(fromReturns.execution.inNewsLayout),
+            "== V3.user.at\n" + first +
+                "\n# Carried over from the installation before the migration:\n# ours\n" + own +
+                "\n");
+}
+
+// Only the clauses that differ are written anew.
+TEST(Execution, AMergedDefinitionKeepsTheTextOfNews) {
+  const std::string plain =
+      "attributetypes=( 1.1 NAME 'a' # of the standard\n  DESC 'd'\n  USAGE u )\n";
+  const std::string sites = "attributetypes=( 1.1 NAME ( 'a' 'mine' ) DESC 'd' USAGE u )\n";
+  const std::string releases =
+      "attributetypes=( 1.1   NAME 'a' # X-ORIGIN 'RFC 1'\n  DESC 'new'\n  USAGE u )\n";
+  const Outcome result =
+      run({{"V3.user.at", plain}}, {{"V3.user.at", sites}}, {{"V3.user.at", releases}});
+  EXPECT_EQ(textOf(result.execution.failures), "");
+  EXPECT_EQ(textOf(result.execution.inNewsLayout),
+            "== V3.user.at\n"
+            "attributetypes=( 1.1   NAME ( 'a' 'mine' ) # X-ORIGIN 'RFC 1'\n  DESC 'new'\n"
+            "  USAGE u )\n");
+}
+
 // ---- Generated triples ----
 
 class Generator {

@@ -398,6 +398,69 @@ TEST(ThreeWay, ReferencesOfWhatIsCarriedFollowARename) {
   });
 }
 
+// The result of a migration is OLD of the next: its references bear the new name already.
+TEST(ThreeWay, AReferenceThatFollowedARenameIsNoChange) {
+  const std::string renamed = at("1.1 NAME 'b' DESC 'd' USAGE u");
+  expectOutcomes({
+      {"OfWhatIsKept",
+       {kPlain + at("1.2 NAME 'k' SUP a USAGE u"),
+        renamed + at("1.2 NAME 'k' SUP b USAGE u") + oc("9.1 NAME 'guard' ABSTRACT MAY ( k )"),
+        renamed},
+       "attribute type k (1.2): removed by release -> kept (the release removed it, but the site's "
+       "object class guard (9.1) refers to it) ( 1.2 NAME ( 'k' ) SUP b USAGE u )\n"
+       "object class guard (9.1): added by site -> added (the site added it) "
+       "( 9.1 NAME ( 'guard' ) ABSTRACT MAY ( k ) )\n"},
+      {"OfWhatTheReleaseRemoved",
+       {kPlain + oc("2.1 NAME 'c' ABSTRACT MUST ( a )"),
+        renamed + oc("2.1 NAME 'c' ABSTRACT MUST ( b )"), renamed},
+       "object class c (2.1): removed by release -> dropped (the release removed it, and the site "
+       "had not changed it)\n"},
+      {"NotWhereTheOldNameIsInUse",
+       {kPlain + oc("2.1 NAME 'c' ABSTRACT MUST ( a )"),
+        renamed + oc("2.1 NAME 'c' ABSTRACT MUST ( a $ b )"), renamed},
+       "object class c (2.1): removed by release -> undecided (the release removed it, and the "
+       "site had changed it)\n"},
+  });
+}
+
+TEST(ThreeWay, AReferenceThatFollowsMeetsNoneTwice) {
+  expectOutcomes({
+      {"InOneList",
+       {kPlain, kPlain + oc("9.1 NAME 'guard' ABSTRACT MUST ( a $ b )"),
+        at("1.1 NAME 'b' DESC 'd' USAGE u")},
+       "attribute type a (1.1): changed by release, renamed -> new (only the release changed it)\n"
+       "object class guard (9.1): added by site -> added (the site added it) [MUST names 'a', "
+       "which is called 'b' in the result: the reference follows] [what it names twice now is "
+       "named once, in MUST rather than in MAY] ( 9.1 NAME ( 'guard' ) ABSTRACT MUST ( b ) )\n"},
+  });
+}
+
+TEST(ThreeWay, AMemberThatMovesToMustIsToldAlsoWhereMayDidNotChange) {
+  EXPECT_EQ(clausesOf({oc("2.1 NAME 'c' ABSTRACT MAY ( x )"),
+                       oc("2.1 NAME 'c' ABSTRACT MUST ( x ) MAY ( x )"),
+                       oc("2.1 NAME 'c' DESC 'n' ABSTRACT MAY ( x )")}),
+            "DESC<><><'n'>=<'n'> cosmetic\n"
+            "MUST<><x><>=<x> data\n"
+            "MAY<x><x><x>=<> data\n");
+}
+
+TEST(ThreeWay, OfTwoThatTheSiteHasUnderOneOidOneIsWritten) {
+  expectOutcomes({
+      {"TheFirst",
+       {"", at("9.1 NAME 'x' USAGE u") + at("9.1 NAME 'y' USAGE u"), ""},
+       "attribute type x (9.1): added by site -> added (the site added it) "
+       "( 9.1 NAME ( 'x' ) USAGE u )\n"
+       "attribute type y (9.1): added by site -> undecided (its OID 9.1 is that of OLD's attribute "
+       "type x (9.1) too, and the library writes only that one)\n"},
+      {"TheClass",
+       {"", at("9.1 NAME 'x' USAGE u") + oc("9.1 NAME 'c' ABSTRACT"), ""},
+       "attribute type x (9.1): added by site -> undecided (its OID 9.1 is that of OLD's object "
+       "class c (9.1) too, and the library writes only that one)\n"
+       "object class c (9.1): added by site -> added (the site added it) "
+       "( 9.1 NAME ( 'c' ) ABSTRACT )\n"},
+  });
+}
+
 // ---- Without BASE, and with a preference ----
 
 TEST(ThreeWay, WithoutBaseNobodyCanTell) {
@@ -542,6 +605,70 @@ TEST(ThreeWay, WhatNewHasOnlyInAConfigFileStaysUndecided) {
               "attribute type a (1.1): changed by site -> undecided (NEW has it only in "
               "V3.config.at, which is carried over as it is, and the site changed it)");
   }
+}
+
+// Nor what lies behind such a definition, or before one.
+TEST(ThreeWay, WhatHasToStayNewsIsUndecidedWhereTheSiteChangedIt) {
+  const std::string extension = orv("1.1 DBNAME ( 'a' )");
+  const std::string secret = orv("1.1 DBNAME ( 'a' ) ACCESS-CLASS secret");
+  const std::string renumbered = at("9.1 NAME 'a' DESC 'd' USAGE u");
+  const struct {
+    const char* rule;
+    std::vector<NamedText> shipped;
+    std::vector<NamedText> old;
+    const char* outcomes;
+  } cases[] = {
+      {"AnExtensionBesideAnAttributeTypeThere",
+       {{"V3.user.at", extension}, {"V3.config.at", kPlain}},
+       {{"V3.user.at", secret}, {"V3.config.at", kPlain}},
+       "vendor extension 1.1: changed by site -> undecided (NEW has its attribute type only in "
+       "V3.config.at, which is carried over as it is)\n"},
+      {"ARepeatThereOfWhatTheSiteRenumbered",
+       {{"V3.user.at", kPlain}, {"V3.config.at", kPlain}},
+       {{"V3.user.at", renumbered}},
+       "attribute type a (9.1): changed by site, renumbered -> undecided (NEW's OID and first name "
+       "have to stay, because of attribute type a (1.1) of V3.config.at:1 in NEW, which would come "
+       "up in its place)\n"},
+      {"AnotherOfTheFirstNameThatTheSiteRenumbered",
+       {{"V3.system.at", kPlain}, {"V3.user.at", at("1.2 NAME 'A' USAGE v")}},
+       {{"V3.user.at", renumbered}},
+       "attribute type a (9.1): changed by site, renumbered -> undecided (NEW's OID and first name "
+       "have to stay, because of attribute type A (1.2) of V3.user.at:1 in NEW, which would come "
+       "up in its place)\n"},
+      {"TheSecondOfAnOid",
+       {{"V3.user.at", kPlain + at("1.1 NAME 'b' USAGE u")}},
+       {{"V3.user.at", kPlain + at("1.1 NAME 'b' USAGE site")}},
+       "attribute type b (1.1): changed by site -> undecided (NEW has attribute type a (1.1) of "
+       "V3.user.at:1 under its OID too, and the library finds only that one)\n"},
+  };
+  for (const auto& row : cases) {
+    SCOPED_TRACE(row.rule);
+    const Installation base = installationOf("BASE", row.shipped);
+    const Installation old = installationOf("OLD", row.old);
+    const Installation latest = installationOf("NEW", row.shipped);
+    for (const Prefer prefer : {Prefer::kNothing, Prefer::kOld, Prefer::kNew}) {
+      std::string text;
+      for (const Verdict& verdict :
+           migration::compareThreeWay({&base, &old, &latest, {}, {}, prefer, {}, false})
+               .differences) {
+        text += verdict.outcome == migration::Outcome::kSame ? "" : outcomeOf(verdict) + "\n";
+      }
+      EXPECT_EQ(text, row.outcomes);
+    }
+  }
+}
+
+TEST(ThreeWay, AnOidOfWhatDoesNotCountInNewIsTakenToo) {
+  const Installation none = installationOf("BASE", {});
+  const Installation old = inUserFile("OLD", at("1.2 NAME 'mine' USAGE u"));
+  const Installation latest = inUserFile("NEW", kPlain + at("1.2 NAME 'a' USAGE u"));
+  const ThreeWay result =
+      migration::compareThreeWay({&none, &old, &latest, {}, {}, Prefer::kNothing, {}, false});
+  ASSERT_EQ(result.differences.size(), 2U);
+  EXPECT_EQ(outcomeOf(result.differences.back()),
+            "attribute type mine (1.2): taken -> undecided (its OID 1.2 belongs to NEW's attribute "
+            "type a (1.2) of V3.user.at:2)");
+  ASSERT_EQ(result.uncountedOfNew.size(), 1U);
 }
 
 TEST(ThreeWay, AnAdditionGoesWhereTheMergePutsItsOid) {

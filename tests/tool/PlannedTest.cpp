@@ -123,7 +123,8 @@ TEST_F(Planned, DiffLeavesOutWhatIsNotAskedFor) {
   } cases[] = {
       {{"guard"}, "1 difference in 7 definitions", 1},
       {{"GUARD", "1.1"}, "2 differences in 7 definitions", 1},
-      {{"nothing"}, "0 differences in 7 definitions", 0},
+      {{"nothing"}, "0 differences in 7 definitions", 1},
+      {{"b"}, "1 difference in 7 definitions", 1},
       {{"--kind", "object-class"}, "3 differences in 7 definitions", 1},
       {{"--class", "added-by-site"}, "2 differences in 7 definitions", 1},
       {{"--class", "same"}, "1 difference in 7 definitions", 0},
@@ -138,6 +139,42 @@ TEST_F(Planned, DiffLeavesOutWhatIsNotAskedFor) {
     SCOPED_TRACE(row.options.front());
     EXPECT_NE(result.out.find(row.count), std::string::npos) << result.out << result.err;
     EXPECT_EQ(result.exitCode, row.exitCode);
+  }
+}
+
+TEST_F(Planned, DiffOfAnUnknownNameTellsWhatMayHaveBeenMeant) {
+  const ToolResult result = run("diff", {"--base", "@/base", "guerd", "c"});
+  EXPECT_EQ(result.err, "schema-migrate: nothing here is called guerd; near it: guard\n");
+  EXPECT_NE(result.out.find("1 difference in 7 definitions"), std::string::npos) << result.out;
+  EXPECT_EQ(result.exitCode, 1);
+}
+
+// What is removed differs in more than its DESC.
+TEST_F(Planned, DiffThatIgnoresDescTellsWhatWasRemoved) {
+  m_folder.install("base", {{"V3.user.at", at("1.1 NAME 'a' DESC 'd' USAGE u")}});
+  m_folder.install("old", {{"V3.user.at", at("1.1 NAME 'a' DESC 'e' USAGE u")}});
+  m_folder.install("new", {{"V3.user.at", at("1.2 NAME 'b' DESC 'd' USAGE u")}});
+  const ToolResult result =
+      run("diff", {"--base", "@/base", "--ignore", "desc", "--class", "removed-by-release"});
+  EXPECT_NE(result.out.find("attribute type a (1.1): removed by release -> undecided"),
+            std::string::npos)
+      << result.out;
+  EXPECT_EQ(result.exitCode, 1);
+}
+
+// Everything in one run: also what stands in OLD a second time, and does not count.
+TEST_F(Planned, PlanTellsTheFindingsOnItsInputs) {
+  m_folder.install("old", {{"V3.user.at", at("9.1 NAME 's' USAGE userApplications") +
+                                              at("9.2 NAME 'S' USAGE userApplications")},
+                           {"V3.more", ""}});
+  const ToolResult result = run("plan", {"--base", "@/base", "--exclude-oids", "@/oids"});
+  EXPECT_EQ(result.exitCode, 3);
+  m_folder.write("oids", "9.9\n");
+  const ToolResult listed = run("plan", {"--base", "@/base", "--exclude-oids", "@/oids"});
+  const std::string findings = listed.out + listed.err;
+  for (const char* const finding :
+       {"V3.user.at:2:", "[T301]", "V3.more", "[I702]", "oids:1:1", "[O503]"}) {
+    EXPECT_NE(findings.find(finding), std::string::npos) << finding << "\n" << findings;
   }
 }
 

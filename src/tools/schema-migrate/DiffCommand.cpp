@@ -36,7 +36,7 @@ Example:
 
 Exit codes:
   0  no difference
-  1  differences
+  1  differences, or a name that nothing has
   2  the command line is wrong
   3  an input is missing, unreadable, too large or cannot be parsed
   4  BASE equals OLD or NEW, and --accept-base is not given
@@ -91,11 +91,14 @@ class DiffCommand : public Command {
     } else {
       console->printText(renderDifferences(*plan, shown, {isColourWanted(), m_isSummaryOnly}));
     }
+    std::string unknown = renderUnknownNames(*plan, m_filter.names);
+    const bool isAllKnown = unknown.empty();
+    console->complain(&unknown);
     const bool isAllSame =
         std::all_of(shown.begin(), shown.end(), [](const migration::Verdict* verdict) {
           return verdict->outcome == migration::Outcome::kSame;
         });
-    return isAllSame ? kDone : kFindings;
+    return isAllSame && isAllKnown ? kDone : kFindings;
   }
 
  private:

@@ -1,6 +1,7 @@
 #include "PlanReport.h"
 
 #include <libschema-migration/Content.h>
+#include <libschema-migration/Inheritance.h>
 #include <libschema-migration/Verdict.h>
 
 #include <algorithm>
@@ -58,17 +59,29 @@ bool isIgnored(const ClauseChange& change, const std::vector<std::string>& ignor
          normal(change.old) == normal(change.latest);
 }
 
-bool isShown(const Verdict& row, const DifferenceFilter& filter) {
+// A vendor extension also goes by the names of its attribute type.
+bool isAskedFor(const MigrationPlan& plan, const Verdict& row,
+                const std::vector<std::string>& names) {
+  return names.empty() || isNamed(row, names) ||
+         (row.match.attribute != migration::kNoRow &&
+          isNamed(plan.threeWay.differences[row.match.attribute], names));
+}
+
+// What OLD or NEW lacks differs in more than its clauses.
+bool isAllIgnored(const Verdict& row, const std::vector<std::string>& ignored) {
+  return !ignored.empty() && row.match.old != nullptr && row.match.latest != nullptr &&
+         !row.clauses.empty() &&
+         std::all_of(row.clauses.begin(), row.clauses.end(),
+                     [&](const ClauseChange& change) { return isIgnored(change, ignored); });
+}
+
+bool isShown(const MigrationPlan& plan, const Verdict& row, const DifferenceFilter& filter) {
   const bool isSame =
       row.outcome == migration::Outcome::kSame || row.outcome == migration::Outcome::kGone;
   if (isSame && !filter.isWithSame) {
     return false;
   }
-  const bool isAllIgnored =
-      !filter.ignored.empty() && !row.clauses.empty() &&
-      std::all_of(row.clauses.begin(), row.clauses.end(),
-                  [&](const ClauseChange& change) { return isIgnored(change, filter.ignored); });
-  return !isAllIgnored && (filter.names.empty() || isNamed(row, filter.names)) &&
+  return !isAllIgnored(row, filter.ignored) && isAskedFor(plan, row, filter.names) &&
          (filter.kinds.empty() || contains(filter.kinds, wordOf(row.kind()))) &&
          (filter.changes.empty() || contains(filter.changes, wordOf(row.change))) &&
          (filter.risks.empty() || contains(filter.risks, wordOf(row.risk)));
@@ -200,11 +213,35 @@ std::string lineOf(const migration::Failure& failure) {
 ShownDifferences shownOf(const MigrationPlan& plan, const DifferenceFilter& filter) {
   ShownDifferences shown;
   for (const Verdict& row : plan.threeWay.differences) {
-    if (isShown(row, filter)) {
+    if (isShown(plan, row, filter)) {
       shown.push_back(&row);
     }
   }
   return shown;
+}
+
+std::string renderUnknownNames(const MigrationPlan& plan, const std::vector<std::string>& names) {
+  std::string lines;
+  for (const std::string& name : names) {
+    const bool isKnown =
+        std::any_of(plan.threeWay.differences.begin(), plan.threeWay.differences.end(),
+                    [&](const Verdict& row) { return isNamed(row, {name}); });
+    if (isKnown) {
+      continue;
+    }
+    std::vector<std::string> near = nearestNames(*plan.old, name);
+    for (const std::string& other : nearestNames(*plan.latest, name)) {
+      if (!contains(near, other)) {
+        near.push_back(other);
+      }
+    }
+    std::string list;
+    for (const std::string& other : near) {
+      list += (list.empty() ? "; near it: " : ", ") + wholePrintable(other);
+    }
+    lines += errorLine("nothing here is called " + wholePrintable(name) + list);
+  }
+  return lines;
 }
 
 std::string renderDifferences(const MigrationPlan& plan, const ShownDifferences& shown,
