@@ -308,4 +308,168 @@ TEST(Properties, SwappingTheSidesSwapsTheWords) {
   });
 }
 
+// ---- Decisions ----
+
+std::string idOf(const Verdict& row) {
+  return placeOf(row.match.base) + placeOf(row.match.old) + placeOf(row.match.latest);
+}
+
+std::string outcomeOf(const Verdict& row) {
+  return std::string(wordOf(row.outcome)) +
+         (row.result ? " " + migration::textOf(*row.result) : "") + (row.isTakenOut ? " out" : "");
+}
+
+// The names and OIDs that a definition has, or has had.
+std::set<std::string> namesOf(const Verdict& row) {
+  std::set<std::string> names;
+  for (const Entry* const entry : {row.match.base, row.match.old, row.match.latest}) {
+    if (entry != nullptr) {
+      names.insert(entry->kept->object->oidInPlace());
+      for (const std::string& name : entry->kept->object->namesInPlace()) {
+        names.insert(migration::folded(name));
+      }
+    }
+  }
+  return names;
+}
+
+bool refersTo(const Verdict& row, const std::set<std::string>& names) {
+  for (const Entry* const entry : {row.match.base, row.match.old, row.match.latest}) {
+    if (entry == nullptr) {
+      continue;
+    }
+    const migration::Content content = migration::contentOf(*entry->kept);
+    for (const migration::Aspect aspect :
+         {migration::Aspect::kSup, migration::Aspect::kMust, migration::Aspect::kMay}) {
+      for (const std::string& name : content[aspect]) {
+        if (names.count(migration::folded(name)) != 0) {
+          return true;
+        }
+      }
+    }
+  }
+  return false;
+}
+
+migration::Decision someDecision(triples::Generator* generator, const Verdict& row) {
+  static const migration::Take kTakes[] = {migration::Take::kOld, migration::Take::kNew,
+                                           migration::Take::kBase, migration::Take::kMerged,
+                                           migration::Take::kDrop};
+  migration::Decision decision;
+  decision.file = "d.toml";
+  decision.line = 1;
+  decision.kind = row.kind();
+  decision.oid = row.entry().kept->object->oidInPlace();
+  decision.fingerprint = fingerprintOf(row);
+  const bool isNamed = row.kind() != migration::Kind::kVendorExtension && row.match.old != nullptr;
+  const int way = generator->pick(isNamed ? 8 : 5);
+  if (way < 5) {
+    decision.take = kTakes[way];
+  } else if (way == 5) {
+    decision.rename = "renamed";
+  } else if (way == 6) {
+    decision.renumber = "9.99";
+  } else {
+    decision.text = migration::textOf(migration::contentOf(*row.match.old->kept));
+  }
+  return decision;
+}
+
+// What may differ by one decision: what it names, its extension, what refers to one of them, and
+// what is kept, or not, by such references, and so on.
+std::set<std::string> withinReach(const Compared& before, const Verdict& named) {
+  std::vector<const Verdict*> reached = {&named};
+  std::set<std::string> ids = {idOf(named)};
+  for (std::size_t next = 0; next < reached.size(); ++next) {
+    const std::set<std::string> names = namesOf(*reached[next]);
+    for (const Verdict& row : before.rows()) {
+      const bool isExtension = row.match.attribute != migration::kNoRow &&
+                               &before.rows()[row.match.attribute] == reached[next];
+      const bool isKept = row.match.latest == nullptr && row.match.base != nullptr &&
+                          refersTo(*reached[next], namesOf(row));
+      if ((isExtension || isKept || refersTo(row, names)) && ids.insert(idOf(row)).second) {
+        reached.push_back(&row);
+      }
+    }
+  }
+  return ids;
+}
+
+TEST(Properties, ADecisionChangesNothingButWhatItNamesAndWhatGoesWithIt) {
+  forTriples(400, [&](triples::Generator* generator, const Triple& triple) -> std::string {
+    const Compared before(triple);
+    if (before.rows().empty() || hasSharedOid(triple)) {
+      return "";
+    }
+    const Verdict& named = before.rows()[static_cast<std::size_t>(
+        generator->pick(static_cast<int>(before.rows().size())))];
+    const migration::Decision decision = someDecision(generator, named);
+    const Compared after(triple, {decision});
+    if (!after.threeWay.failures.empty()) {
+      return "";
+    }
+    const std::set<std::string> reach = withinReach(before, named);
+    std::map<std::string, std::string> outcomes;
+    for (const Verdict& row : after.rows()) {
+      outcomes[idOf(row)] = outcomeOf(row);
+    }
+    for (const Verdict& row : before.rows()) {
+      const auto found = outcomes.find(idOf(row));
+      const bool isSame = found != outcomes.end() && found->second == outcomeOf(row);
+      if (!isSame && reach.count(idOf(row)) == 0) {
+        return "decided " + shown(named) + "\n" + shown(row) + "\nthen\n" + shown(after.threeWay);
+      }
+    }
+    return "";
+  });
+}
+
+// A decision that can be carried out comes to a result that the library makes.
+TEST(Properties, ADecidedPlanIsCarriedOut) {
+  const PrivateFolder folder;
+  const support::UnfreedDefinitions unfreed;
+  forTriples(100, [&](triples::Generator* generator, const Triple& triple) -> std::string {
+    const Compared before(triple);
+    std::vector<migration::Decision> decisions;
+    for (const Verdict& row : before.rows()) {
+      if (generator->pick(3) == 0) {
+        decisions.push_back(someDecision(generator, row));
+        decisions.back().line = decisions.size();
+        if (!decisions.back().rename.empty()) {
+          decisions.back().rename += std::to_string(decisions.size());
+        }
+        if (!decisions.back().renumber.empty()) {
+          decisions.back().renumber += std::to_string(decisions.size());
+        }
+      }
+    }
+    const Compared after(triple, decisions);
+    if (!after.threeWay.failures.empty()) {
+      return "";
+    }
+    const Execution execution = execute(after.request, after.threeWay, folder.emptied());
+    return execution.failures.empty() ? "" : shown(execution.failures) + shown(after.threeWay);
+  });
+}
+
+TEST(Properties, APreferenceLeavesWhatIsTakenRemovedOrRenumbered) {
+  const PrivateFolder folder;
+  const support::UnfreedDefinitions unfreed;
+  forTriples(100, [&](triples::Generator* generator, const Triple& triple) -> std::string {
+    const Compared before(triple);
+    const Prefer prefer = generator->pick(2) == 0 ? Prefer::kOld : Prefer::kNew;
+    const Compared after(triple, {}, prefer);
+    for (std::size_t row = 0; row < before.rows().size(); ++row) {
+      const Verdict& mine = before.rows()[row];
+      const bool isOpen = mine.match.old != nullptr && mine.match.latest != nullptr &&
+                          !mine.isTaken && !mine.isNewsOnly;
+      if (mine.isUndecided() && !isOpen && !after.rows()[row].isUndecided()) {
+        return shown(mine) + " is " + shown(after.rows()[row]);
+      }
+    }
+    const Execution execution = execute(after.request, after.threeWay, folder.emptied());
+    return execution.failures.empty() ? "" : shown(execution.failures) + shown(after.threeWay);
+  });
+}
+
 }  // namespace
