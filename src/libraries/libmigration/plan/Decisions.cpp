@@ -164,9 +164,8 @@ bool isList(Aspect aspect) {
 // Carries one decision out on its row. Every function returns what is wrong, or "".
 class Carrying {
  public:
-  Carrying(const Decision& decision, const ThreeWayRequest& request, const ResultIndex* ofNew,
-           Verdict* row)
-      : m_decision(decision), m_request(request), m_ofNew(ofNew), m_row(*row) {}
+  Carrying(const Decision& decision, Prefer prefer, const ResultIndex* ofNew, Verdict* row)
+      : m_decision(decision), m_prefer(prefer), m_ofNew(ofNew), m_row(*row) {}
 
   std::string run() {
     Verdict before = m_row;
@@ -328,7 +327,7 @@ class Carrying {
     }
     const Content old = contentOf(*match.old->kept);
     const Content latest = contentOf(*match.latest->kept);
-    const Prefer prefer = isOpenToPreference(m_row) ? m_request.prefer : Prefer::kNothing;
+    const Prefer prefer = isOpenToPreference(m_row) ? m_prefer : Prefer::kNothing;
     Merge merged = match.base == nullptr ? mergeWithoutBase(old, latest, prefer)
                                          : mergeWithBase(baseContentOf(m_row), old, latest, prefer);
     std::string open;
@@ -405,7 +404,7 @@ class Carrying {
   }
 
   const Decision& m_decision;
-  const ThreeWayRequest& m_request;
+  Prefer m_prefer;
   const ResultIndex* m_ofNew;  // what NEW gives; null when nothing is renamed
   Verdict& m_row;
 };
@@ -515,7 +514,7 @@ class Applying {
                          "again, and make it anew");
       return;
     }
-    const std::string problem = Carrying(decision, m_request, &*m_ofNew, &m_rows[row]).run();
+    const std::string problem = Carrying(decision, m_request.prefer, &*m_ofNew, &m_rows[row]).run();
     if (!problem.empty()) {
       fail(decision, who + " cannot be carried out: " + problem);
     }
@@ -597,10 +596,10 @@ std::string fingerprintOf(const Verdict& difference) {
   return "sha256:" + sha256Of(text);
 }
 
-std::string tryDecision(const Decision& decision, const ThreeWayRequest& request,
-                        const ResultIndex& result, const Verdict& difference, Verdict* after) {
+std::string tryDecision(const Decision& decision, Prefer prefer, const ResultIndex& result,
+                        const Verdict& difference, Verdict* after) {
   *after = difference;
-  const std::string problem = Carrying(decision, request, nullptr, after).run();
+  const std::string problem = Carrying(decision, prefer, nullptr, after).run();
   return problem.empty() ? clashOf(result, *after, &difference) : problem;
 }
 

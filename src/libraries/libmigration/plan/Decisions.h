@@ -61,8 +61,8 @@ class ResultIndex;
 // What one decision would come to: *after is the difference with it carried out. Returns what is
 // wrong, or "". `result` has everything that the result has so far, and the difference is one of
 // its.
-std::string tryDecision(const Decision& decision, const ThreeWayRequest& request,
-                        const ResultIndex& result, const Verdict& difference, Verdict* after);
+std::string tryDecision(const Decision& decision, Prefer prefer, const ResultIndex& result,
+                        const Verdict& difference, Verdict* after);
 
 }  // namespace migration
 

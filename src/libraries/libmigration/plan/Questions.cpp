@@ -55,7 +55,8 @@ std::vector<ClauseChoices> clausesOf(const Verdict& row) {
 }  // namespace
 
 Questionnaire::Questionnaire(const MigrationPlan& plan)
-    : m_result(std::make_unique<ResultIndex>(plan.threeWay.differences, ResultIndex::Of::kAll)) {
+    : m_result(std::make_unique<ResultIndex>(plan.threeWay.differences, ResultIndex::Of::kAll)),
+      m_prefer(plan.request.prefer) {
   std::set<std::pair<Kind, std::string>> seen;
   for (const Verdict& row : plan.threeWay.differences) {
     if (row.isUndecided() && !goesWithAnUndecidedAttribute(row, plan)) {
@@ -83,7 +84,7 @@ Question Questionnaire::about(const Verdict& difference) const {
     Decision decision;
     decision.take = take;
     Choice choice{take, difference};
-    if (tryDecision(decision, m_plan.request, *m_result, difference, &choice.after).empty()) {
+    if (tryDecision(decision, m_prefer, *m_result, difference, &choice.after).empty()) {
       question.choices.push_back(std::move(choice));
     }
   }

@@ -58,6 +58,7 @@ class Questionnaire {
  private:
   std::vector<const Verdict*> m_open;
   std::unique_ptr<const ResultIndex> m_result;
+  Prefer m_prefer;
   std::set<std::pair<Kind, std::string>> m_sharedOids;  // that are no name for one definition alone
 };
 
