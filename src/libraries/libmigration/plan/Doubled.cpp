@@ -18,6 +18,14 @@ bool bringsOid(const Verdict& row) {
          (row.match.latest == nullptr || row.result->oid() != oidOf(*row.match.latest));
 }
 
+// What somebody decided stays; another one is asked about then.
+bool isRatherWritten(const Verdict& row, const Verdict& other) {
+  if (row.decision.empty() != other.decision.empty()) {
+    return !row.decision.empty();
+  }
+  return row.kind() == Kind::kObjectClass && other.kind() == Kind::kAttributeType;
+}
+
 }  // namespace
 
 void findDoubled(const ThreeWayRequest& request, std::vector<Verdict>* differences) {
@@ -25,8 +33,7 @@ void findDoubled(const ThreeWayRequest& request, std::vector<Verdict>* differenc
   for (const Verdict& row : *differences) {
     if (bringsOid(row)) {
       const auto [place, isFirst] = written.emplace(row.result->oid(), &row);
-      if (!isFirst && row.kind() == Kind::kObjectClass &&
-          place->second->kind() == Kind::kAttributeType) {
+      if (!isFirst && isRatherWritten(row, *place->second)) {
         place->second = &row;
       }
     }

@@ -146,12 +146,12 @@ bool isEqualToTheLibrary(const Verdict& row) {
 }
 
 // Whether NEW's definition has to go before the result's can come: the merge replaces only what has
-// the same OID and first name, and the comparison must see a difference.
+// the same OID and first name.
 bool isNewsInTheWay(const Verdict& row) {
   if (!row.isCarried() || row.match.latest == nullptr) {
     return row.isTakenOut;
   }
-  return hasOtherIdentity(*row.result, *row.match.latest) || isEqualToTheLibrary(row);
+  return hasOtherIdentity(*row.result, *row.match.latest);
 }
 
 // What a definition says beside what the library keeps: "X-ORIGIN 'here'".
@@ -243,6 +243,8 @@ void writeTexts(std::vector<Verdict>* differences) {
       tellWhatIsLost("NEW's", row.match.latest, &row);
     }
     row.isNewsInTheWay = isNewsInTheWay(row);
+    row.isEqualToNews = row.isCarried() && row.match.latest != nullptr && !row.isNewsInTheWay &&
+                        isEqualToTheLibrary(row);
   }
 }
 

@@ -87,6 +87,15 @@ Span wholeOf(const Entry& entry) {
   return span;
 }
 
+// Something that the library's comparison finds to differ, so that the merge replaces it.
+Content altered(Content content) {
+  const Aspect aspect =
+      content.kind == Kind::kVendorExtension ? Aspect::kAccessClass : Aspect::kDesc;
+  std::string text = content[aspect].empty() ? std::string() : content[aspect].front();
+  content[aspect] = {text + "x"};
+  return content;
+}
+
 using EditsByFile = std::map<const SchemaFile*, TextEdits>;
 
 void cut(const Entry& entry, EditsByFile* edits) {
@@ -291,9 +300,12 @@ StagedTexts stage(const ThreeWayRequest& request, const ThreeWay& threeWay) {
     } else if (isListed && row.match.old != nullptr) {
       old[row.match.old->file->name] += lineOf(row.kind(), textOf(contentOf(*row.match.old->kept)));
     }
-    if (row.match.latest != nullptr && row.isNewsInTheWay) {
-      for (const Entry* const entry : places.repeatsOf(row)) {
+    for (const Entry* const entry : places.repeatsOf(row)) {
+      if (row.isNewsInTheWay) {
         cut(*entry, &edits);
+      } else if (row.isEqualToNews) {
+        const Span span = parenthesesOf(*entry);
+        edits[entry->file].replace(span.begin, span.end, textOf(altered(*row.result)));
       }
     }
   }

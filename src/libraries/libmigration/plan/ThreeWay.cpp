@@ -304,8 +304,7 @@ namespace {
 
 // What came to be NEW's, by references that follow, is NEW's.
 void giveToNew(Verdict* row) {
-  const bool isMerged = row->outcome == Outcome::kOld || row->outcome == Outcome::kMerged;
-  if (isMerged && row->isCarried() && row->match.latest != nullptr &&
+  if (row->isCarried() && row->match.latest != nullptr &&
       row->result->values == contentOf(*row->match.latest->kept).values) {
     row->result.reset();
     row->outcome = row->decision.empty() ? Outcome::kNew : row->outcome;
@@ -357,6 +356,7 @@ ThreeWay compareThreeWay(const ThreeWayRequest& request) {
   applyDecisions(request, &rows, &result.failures);
   joinExtensions(request, &rows);
   settleReferences(result.uncountedOfNew, &rows);
+  findDoubled(request, &rows);
   joinExtensions(request, &rows);
   findTakenExtensions(&rows);
   followOids(&rows);

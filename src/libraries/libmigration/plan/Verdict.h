@@ -76,8 +76,10 @@ struct Verdict {
   std::string file;         // where the result goes when NEW does not have it: "V3.user.at"
   bool isTakenOut = false;  // a decision drops what NEW has
   std::string decision;     // where the decision about it stands, "FILE:LINE"; mostly empty
-  // Whether NEW's has to go before the result's can come, instead of being replaced.
+  // Whether NEW's has to go before the result's can come, instead of being replaced; whether the
+  // library takes the two for equal.
   bool isNewsInTheWay = false;
+  bool isEqualToNews = false;
   // Of what is carried: its definition as it stands in NEW's layout, from "(" to ")".
   std::string text;
 
