@@ -22,7 +22,7 @@ if(LIBSCHEMA_REFERENCE)
   file(GLOB inputs CONFIGURE_DEPENDS ${PROJECT_BINARY_DIR}/include/*/*.h
        ${PROJECT_SOURCE_DIR}/docs/reference/*.md)
   add_custom_command(OUTPUT ${PROJECT_BINARY_DIR}/reference/html/index.html
-                     COMMAND ${DOXYGEN} ${settings}
+                     COMMAND ${CMAKE_COMMAND} -E env LC_ALL=C.UTF-8 ${DOXYGEN} ${settings}
                      DEPENDS ${settings} ${inputs} ${PROJECT_SOURCE_DIR}/docs/reference/comments.awk
                      COMMENT "Making the reference" VERBATIM)
   add_custom_target(reference ALL DEPENDS ${PROJECT_BINARY_DIR}/reference/html/index.html)
