@@ -20,6 +20,7 @@ class PlacedLexan final : public SchemaLexan {
   // The bytes are not copied, and must stay as they are as long as the analyser reads.
   explicit PlacedLexan(std::string_view bytes);
 
+  // As SchemaLexan has it; throws NeverCompletes where it says so.
   int lexan() override;
 
   // How many bytes there are up to the end of the token that lexan() returned last, and up to that

@@ -133,6 +133,8 @@ class SchemaManager {
 
   // ---- Debug print, to standard output ----
 
+  // Each prints one table, or one set of OIDs: the attribute types, vendor extensions and object
+  // classes; the sets of the user, vendor and system files; the excluded OIDs. Nothing is changed.
   void dumpAttrTable();
   void dumpORVAttrTable();
   void dumpOcTable();

@@ -37,6 +37,7 @@ void ldtr_exit_errcode(unsigned long identifier, unsigned long kind, unsigned lo
 // A record under construction, of a function that has an identifier.
 class ldtr_formater_local {
  public:
+  // Keeps what the record will have: the function, the level, and the object or null.
   ldtr_formater_local(unsigned long identifier, unsigned long level, void const* pointer)
       : m_identifier(identifier), m_level(level), m_pointer(pointer) {}
 
@@ -47,6 +48,7 @@ class ldtr_formater_local {
   void debug(unsigned long debugLevel, char const* format, ...)
       __attribute__((format(printf, 3, 4)));
 
+  // As it was made with.
   unsigned long identifier() const { return m_identifier; }
   unsigned long level() const { return m_level; }
 
@@ -59,12 +61,14 @@ class ldtr_formater_local {
 // A record under construction, of code outside any numbered function.
 class ldtr_formater_global {
  public:
+  // Keeps the level that the record will have.
   ldtr_formater_global(unsigned long level) : m_level(level) {}
 
   // Writes a printf-style debug record. Given by the facility.
   void debug(unsigned long debugLevel, char const* format, ...)
       __attribute__((format(printf, 3, 4)));
 
+  // As it was made with.
   unsigned long level() const { return m_level; }
 
  private:
@@ -74,9 +78,11 @@ class ldtr_formater_global {
 // The guard of code outside any numbered function, used through the object `ldtr_fun`.
 class ldtr_function_global {
  public:
+  // Begins a record of this level.
   ldtr_formater_global operator()(unsigned long level) { return ldtr_formater_global(level); }
 };
 
+// The one object of its class, given by the facility.
 extern ldtr_function_global ldtr_fun;
 
 // The guard of a numbered function: created on entry, it writes the exit record when it is
@@ -85,6 +91,7 @@ extern ldtr_function_global ldtr_fun;
 template <unsigned long kIdentifier, unsigned long kKind, unsigned long kEntryBit>
 class ldtr_function_local {
  public:
+  // On entry; `pointer` is the object that the function is of, or null.
   ldtr_function_local(void const* pointer) : m_errorCode(0), m_pointer(pointer) {}
   ldtr_function_local(const ldtr_function_local&) = delete;
   ldtr_function_local& operator=(const ldtr_function_local&) = delete;
@@ -95,6 +102,7 @@ class ldtr_function_local {
     }
   }
 
+  // Begins a record of this level.
   ldtr_formater_local operator()(unsigned long level) {
     return ldtr_formater_local(kIdentifier, level, m_pointer);
   }

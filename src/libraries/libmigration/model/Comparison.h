@@ -14,8 +14,10 @@ namespace migration {
 // The library's equality, asked from both sides. Definitions of two kinds are never equal.
 bool areEqual(const KeptDefinition& left, const KeptDefinition& right);
 
+// What comes of a comparison.
 enum class Comparison : std::uint8_t { kEqual, kDifferent, kOnlyLeft, kOnlyRight };
 
+// A definition and its partner.
 struct Compared {
   Kind kind;
   Comparison result;

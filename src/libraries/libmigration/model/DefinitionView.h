@@ -13,6 +13,7 @@
 
 namespace migration {
 
+// As the library keeps it, or as it is written.
 enum class Reading : std::uint8_t { kKept, kWritten };
 
 // A clause as it is shown: quoted texts with their quotes, no value for a flag.

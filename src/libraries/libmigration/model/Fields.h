@@ -11,6 +11,7 @@
 
 namespace migration {
 
+// A clause with its values.
 struct Field {
   Clause clause;
   std::vector<std::string> values;  // none for a flag, such as SINGLE-VALUE

@@ -16,6 +16,7 @@ namespace migration {
 // The definitions that SUP of `entry` names directly, as far as they are there, in its order.
 std::vector<const Entry*> superiorsOf(const Installation& installation, const Entry& entry);
 
+// A clause that a definition has from a superior.
 struct Inherited {
   Clause clause;
   std::string value;
@@ -30,6 +31,7 @@ std::vector<Inherited> inheritedBy(const Installation& installation, const Entry
 // Definitions below their superiors, by first name in ascending order. One with several superiors
 // is below each of them; what would close a loop is left out, so that every walk ends.
 struct SuperiorTree {
+  // A definition at one place of the tree.
   struct Node {
     const Entry* entry;
     std::vector<std::size_t> below;  // numbers of nodes

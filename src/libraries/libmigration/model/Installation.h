@@ -29,6 +29,7 @@ constexpr std::array<const char*, 9> kSchemaFiles = {
 // The place of a file in kSchemaFiles; their number for a name that is none of them.
 std::size_t schemaFileNumber(std::string_view name);
 
+// A file in both readings.
 struct SchemaFile {
   std::string name;   // "V3.user.at"
   unsigned mode = 0;  // its permissions; 0 in memory
@@ -43,6 +44,7 @@ struct Entry {
   const KeptDefinition* kept = nullptr;
   const WrittenDefinition* written = nullptr;  // of the same text; null when there is none
 
+  // Its kind, and the place of its "(".
   Kind kind() const { return kept->kind; }
   Place place() const { return file->source->placeOf(kept->offset); }
 };
@@ -63,6 +65,7 @@ struct Reference {
   std::string_view name;               // as written
   std::size_t offset = 0;              // of the name
 
+  // The place of the name.
   Place place() const { return file->source->placeOf(offset); }
 };
 
@@ -85,6 +88,7 @@ class Installation {
   Installation& operator=(Installation&&) noexcept;
   ~Installation();
 
+  // As it was given.
   const std::string& directory() const;
   // Of all files together.
   std::uint64_t size() const;

@@ -14,12 +14,14 @@
 
 namespace migration {
 
+// What the library makes of a word.
 enum class WordUse : std::uint8_t {
   kTaken,         // an OID of the list
   kLastIsLost,    // the end of the file follows directly
   kCutByComment,  // "#" stands behind its first character: it is not used
 };
 
+// A word of the list.
 struct OidWord {
   std::string_view text;  // whole, "#" and what follows it included
   std::size_t offset;

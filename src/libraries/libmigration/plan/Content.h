@@ -42,8 +42,10 @@ enum class Aspect : std::uint8_t {
   kIndexApprox,
   kIndexReverse
 };
+// How many there are.
 constexpr std::size_t kAspectCount = 22;
 
+// The texts of one clause.
 using Values = std::vector<std::string>;
 
 // "SYNTAX", "NAME" for the first name, "ALIASES", "KIND" of a class, "EQUALITY" for the flag, too.
@@ -57,14 +59,17 @@ struct Content {
   Kind kind = Kind::kAttributeType;
   std::array<Values, kAspectCount> values;
 
+  // The values of a clause.
   const Values& operator[](Aspect aspect) const { return values[static_cast<std::size_t>(aspect)]; }
   Values& operator[](Aspect aspect) { return values[static_cast<std::size_t>(aspect)]; }
 
+  // The OID, which every definition has.
   const std::string& oid() const { return (*this)[Aspect::kOid].front(); }
   // The first name and the further ones.
   Values names() const;
 };
 
+// What a definition says, as the library keeps it.
 Content contentOf(const KeptDefinition& definition);
 
 // Whether two definitions say the same in one clause: names and lists without regard to letter case

@@ -24,6 +24,7 @@ enum class Take : std::uint8_t { kNothing, kOld, kNew, kBase, kMerged, kDrop, kU
 // "old", "new", "base", "merged", "drop", "union"; empty for kNothing.
 std::string_view wordOf(Take take);
 
+// An entry of a decisions file: what somebody has decided about one definition.
 struct Decision {
   std::string file;
   std::uint64_t line = 0;  // where its entry begins

@@ -11,6 +11,7 @@
 
 namespace migration {
 
+// The number of no row.
 constexpr std::size_t kNoRow = static_cast<std::size_t>(-1);
 
 // One definition, as far as the three have it; null where one does not.

@@ -20,6 +20,7 @@ enum class Risk : std::uint8_t { kNone, kCosmetic, kStructure, kData };
 // "none", "cosmetic", "structure", "data".
 std::string_view wordOf(Risk risk);
 
+// Whose side is taken where a clause was changed in two ways.
 enum class Prefer : std::uint8_t { kNothing, kOld, kNew };
 
 // A clause that is not the same everywhere. What a side does not have is empty, and so is the

@@ -20,6 +20,7 @@
 
 namespace migration {
 
+// What is to be planned, and with which options.
 struct PlanRequest {
   std::string base;  // directories; empty for no BASE
   std::string old;
@@ -58,6 +59,7 @@ struct MigrationPlan {
   Failures refusals;
   std::size_t undecidedCount = 0;
 
+  // Whether the migration may go ahead.
   bool isReady() const { return failures.empty() && refusals.empty() && undecidedCount == 0; }
 
   // What everything above refers to.

@@ -12,6 +12,7 @@
 
 namespace migration {
 
+// What a record is made of. Everything that it points to must stay in place for the call.
 struct RecordRequest {
   const MigrationPlan* plan = nullptr;  // one that is ready
   std::vector<NamedText> outputs;       // as they are written
@@ -25,6 +26,7 @@ struct RecordRequest {
   std::string htmlReport;  // as a page; none when it is empty
 };
 
+// A file of the record.
 struct RecordFile {
   std::string folder;  // in the record: "old"; empty for the record itself
   std::string name;

@@ -11,6 +11,7 @@
 
 namespace migration {
 
+// Where a text stood.
 struct SourcePlace {
   std::string side;  // "base", "old", "new"
   std::string path;

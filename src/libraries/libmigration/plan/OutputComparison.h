@@ -22,6 +22,7 @@ struct PlannedFiles {
   bool isInLibraryLayout = false;
 };
 
+// A clause that is not as planned.
 struct ClauseDifference {
   Aspect aspect = Aspect::kOid;
   Values planned;  // empty without the clause

@@ -28,6 +28,7 @@ struct ClauseChoices {
   std::vector<Take> takes;
 };
 
+// An undecided definition, and what can be decided about it.
 struct Question {
   const Verdict* difference = nullptr;
   std::vector<Choice> choices;         // in the order old, new, base, merged, drop
@@ -39,6 +40,7 @@ struct Question {
 // The questions of a plan. They refer to it, and mean nothing once it is decided anew.
 class Questionnaire {
  public:
+  // Collects what is undecided in the plan, which must stay in place.
   explicit Questionnaire(const MigrationPlan& plan);
   Questionnaire(const Questionnaire&) = delete;
   Questionnaire& operator=(const Questionnaire&) = delete;

@@ -22,6 +22,7 @@ class Side {
   // The installation must stay in place.
   explicit Side(const Installation& installation);
 
+  // The one that it was made of.
   const Installation& installation() const { return *m_installation; }
 
   // In the order of reading, by kind.

@@ -11,6 +11,7 @@
 
 namespace migration {
 
+// The two installations that libschema merges into the result.
 struct StagedTexts {
   // Everything of OLD's that stands in the result, in the file where the result has it, and what
   // the lists name, as OLD has it.
@@ -19,6 +20,7 @@ struct StagedTexts {
   // name in the result.
   std::vector<NamedText> latest;
 };
+// Makes them of what was decided; what is undecided stays NEW's.
 StagedTexts stage(const ThreeWayRequest& request, const ThreeWay& threeWay);
 
 // The result in NEW's layout: its files byte for byte, a replaced definition where NEW's stood,

@@ -15,6 +15,7 @@
 
 namespace migration {
 
+// What is compared, and how. The installations must stay in place.
 struct ThreeWayRequest {
   const Installation* base = nullptr;  // null without one
   const Installation* old = nullptr;
@@ -43,6 +44,7 @@ struct ThreeWay {
   Failures failures;
 };
 
+// All steps below, one after the other.
 ThreeWay compareThreeWay(const ThreeWayRequest& request);
 
 // ---- Its steps, in their order ----

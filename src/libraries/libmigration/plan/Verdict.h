@@ -88,6 +88,7 @@ struct Verdict {
   // Of an attribute type whose vendor extension goes with it: that of BASE, OLD and NEW, or null.
   std::array<const Entry*, 3> extensions{};
 
+  // Of which kind the definition is.
   Kind kind() const { return match.kind; }
   // The definition by which it is called: OLD's, or NEW's, or BASE's.
   const Entry& entry() const;

@@ -14,6 +14,7 @@
 
 namespace migration {
 
+// What is checked, and how. Everything in it must stay in place for the call.
 struct CheckRequest {
   const Installation* installation = nullptr;
   const Installation* against = nullptr;  // null without one

@@ -20,6 +20,7 @@ struct ExampleFile {
   std::string_view bytes;
 };
 
+// A rule and its page.
 struct RuleInfo {
   const char* id;     // "D208"
   const char* name;   // "single-member-takes-the-end"

@@ -59,11 +59,13 @@ bool severityOf(std::string_view word, Severity* severity);
 // The word of a severity.
 std::string_view wordOf(Severity severity);
 
+// A finding that is accepted, and why.
 struct AcceptedFinding {
   Finding finding;
   std::string reason;
 };
 
+// What the settings leave of findings.
 struct JudgedFindings {
   Findings findings;  // those that remain, in their order
   std::vector<AcceptedFinding> accepted;

@@ -9,6 +9,7 @@
 
 namespace migration {
 
+// What is defined.
 enum class Kind : std::uint8_t { kAttributeType, kObjectClass, kVendorExtension };
 
 // "attribute type", "object class", "vendor extension".
@@ -16,6 +17,7 @@ std::string_view nameOf(Kind kind);
 // "attribute-type", "object-class", "vendor-extension".
 std::string_view wordOf(Kind kind);
 
+// The clauses of all three kinds.
 enum class Clause : std::uint8_t {
   kOid,
   kName,

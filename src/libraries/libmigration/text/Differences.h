@@ -15,7 +15,9 @@
 
 namespace migration {
 
+// A place where the two readings differ.
 struct Difference {
+  // What differs.
   enum Sort : std::uint8_t {
     kField,  // a clause, or a value of it, is kept as another one or not at all
     kLost,   // a definition is not kept
@@ -67,7 +69,7 @@ class Differences {
 // the spellings of the three words that the reader folds, which are no difference here.
 bool isKeptAs(const WrittenValue& value, const std::string& kept);
 
-// A text as messages show it: on one line, other bytes as \xNN, long ones cut short, in quotes.
+// A text as messages show it: on one line, other bytes as `\xNN`, long ones cut short, in quotes.
 std::string quotedForMessage(std::string_view text);
 
 }  // namespace migration

@@ -9,8 +9,10 @@
 
 namespace migration {
 
+// How bad a finding is; one of kOff is not told.
 enum class Severity : std::uint8_t { kOff, kWarning, kError };
 
+// What a rule has found.
 struct Finding {
   std::string rule;  // "D208"
   Severity severity = Severity::kError;
@@ -21,6 +23,7 @@ struct Finding {
   std::string definition;    // "attribute type cn (2.5.4.3)"; empty outside definitions
 };
 
+// In the order that who finds them says.
 using Findings = std::vector<Finding>;
 
 // Something that could not be done. Line and column are 0 where they mean nothing, and the rule is
@@ -33,6 +36,7 @@ struct Failure {
   std::string text;
 };
 
+// In the order in which they happened.
 using Failures = std::vector<Failure>;
 
 }  // namespace migration

@@ -25,12 +25,14 @@ struct ReadLimits {
   // For what is in memory anyway.
   static ReadLimits none() { return {std::numeric_limits<std::uint64_t>::max(), 0, ""}; }
 
+  // How much may still be read.
   std::uint64_t room() const { return bytes - used; }
   // Of a file that is larger than the room: "with this file the inputs have more than 1 GiB in
   // all".
   std::string exceeded() const;
 };
 
+// What a file holds.
 struct FileText {
   std::string bytes;
   unsigned mode = 0;  // the permissions
@@ -39,6 +41,7 @@ struct FileText {
 // A directory that is only read, opened once: whatever becomes of its path, this one is read.
 class InputDirectory {
  public:
+  // Opens it; that it cannot be opened is told by what is asked next.
   explicit InputDirectory(const std::string& path);
   InputDirectory(const InputDirectory&) = delete;
   InputDirectory& operator=(const InputDirectory&) = delete;

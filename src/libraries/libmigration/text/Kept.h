@@ -19,12 +19,14 @@
 
 namespace migration {
 
+// How the reading of a file ends.
 enum class ReadingEnd {
   kWhole,     // the reader takes the whole file
   kFails,     // it reports a failure; what it read before stays
   kNeverEnds  // it would not come back
 };
 
+// A definition as the library keeps it.
 struct KeptDefinition {
   Kind kind;
   bool isInBlock;
@@ -33,15 +35,19 @@ struct KeptDefinition {
   std::size_t end;     // behind the last token that belongs to it
   std::unique_ptr<ORVSchema> object;
 
+  // The object, which must be of this kind.
   const Attribute& attribute() const { return static_cast<const Attribute&>(*object); }
   const ObjectClass& objectClass() const { return static_cast<const ObjectClass&>(*object); }
   const ORVAttribute& extension() const { return static_cast<const ORVAttribute&>(*object); }
 };
 
+// The definitions of one source. It refers to the source, which must stay in place.
 class KeptFile {
  public:
+  // Reads it. There is no failure: what the reader makes of bad bytes is what is asked for.
   explicit KeptFile(const Source& source);
 
+  // What was read, the definitions in the order of reading, and how it ended.
   const Source& source() const { return *m_source; }
   const std::vector<KeptDefinition>& definitions() const { return m_definitions; }
   ReadingEnd ending() const { return m_ending; }

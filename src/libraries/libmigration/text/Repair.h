@@ -10,6 +10,7 @@
 
 namespace migration {
 
+// What was changed at one place.
 struct RepairedPlace {
   std::string rule;  // the one whose finding goes: "D208"
   Place place;       // in the text as it was

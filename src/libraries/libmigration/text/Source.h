@@ -18,6 +18,7 @@ struct Place {
   std::uint64_t column = 1;
 };
 
+// Whether it is the same line and column.
 inline bool operator==(const Place& left, const Place& right) {
   return left.line == right.line && left.column == right.column;
 }
@@ -29,6 +30,7 @@ class Source {
   Source(const Source&) = delete;
   Source& operator=(const Source&) = delete;
 
+  // As they were given.
   const std::string& path() const { return m_path; }
   std::string_view bytes() const { return m_bytes; }
 

@@ -8,6 +8,7 @@
 
 namespace migration {
 
+// A character, and how long it is.
 struct Utf8Character {
   char32_t code = 0;
   std::size_t length = 0;  // in bytes; 0 when the bytes are no character

@@ -20,8 +20,10 @@ namespace migration {
 template <typename Element>
 class Slice {
  public:
+  // Of nothing; of `size` elements from `begin` on.
   Slice() = default;
   Slice(const Element* begin, std::size_t size) : m_begin(begin), m_size(size) {}
+  // As a vector has them; the index, and a first or last one, must be there.
   const Element* begin() const { return m_begin; }
   const Element* end() const { return m_begin + m_size; }
   std::size_t size() const { return m_size; }
@@ -35,8 +37,10 @@ class Slice {
   std::size_t m_size = 0;
 };
 
+// How a value is written.
 enum class Form : std::uint8_t { kWord, kNumber, kQuoted, kDoubleQuoted };
 
+// A value as it is written.
 struct WrittenValue {
   std::string_view raw;  // without quotes, escapes as they stand
   std::uint32_t offset;  // of the first byte, the quote included
@@ -48,6 +52,7 @@ struct WrittenValue {
   std::string text() const;
 };
 
+// A clause as it is written; WrittenFile has its values.
 struct WrittenClause {
   Clause clause;
   bool isList;               // its values stand in parentheses
@@ -58,6 +63,7 @@ struct WrittenClause {
   std::uint32_t valueCount;
 };
 
+// A definition as it is written; WrittenFile has its clauses.
 struct WrittenDefinition {
   Kind kind;
   bool isInBlock;
@@ -96,6 +102,7 @@ enum class Oddity : std::uint8_t {
   kBlockNotClosed           // ends where its "}" is missing at the latest
 };
 
+// One place of such a sort.
 struct WrittenOddity {
   Oddity oddity;
   std::size_t offset;
@@ -105,8 +112,10 @@ struct WrittenOddity {
 // The definitions of one source. It refers to the source, which must stay in place.
 class WrittenFile {
  public:
+  // Reads it. There is no failure: what is wrong with it are oddities.
   explicit WrittenFile(const Source& source);
 
+  // What was read, and the definitions in the order of their places.
   const Source& source() const { return *m_source; }
   const std::vector<WrittenDefinition>& definitions() const { return m_definitions; }
 
@@ -121,6 +130,7 @@ class WrittenFile {
   bool hasText() const { return m_hasText; }
   bool hasSections() const { return m_hasSections; }
 
+  // The clauses of a definition of this file, and the values of a clause, in their order.
   Slice<WrittenClause> clausesOf(const WrittenDefinition& definition) const {
     return {m_clauses.data() + definition.firstClause, definition.clauseCount};
   }
