@@ -68,10 +68,10 @@ TEST_F(CallFault, ListingThatFailsPartWay) {
     if (exitCode != 0) {
       EXPECT_NE(std::string::npos, err.find(": Input/output error\n")) << err;
     }
-    ofOld += err == "@/old: error: the directory cannot be read: Input/output error\n" &&
-                     exitCode == 3
-                 ? 1
-                 : 0;
+    ofOld +=
+        err == "@/old: error: the directory cannot be read: Input/output error\n" && exitCode == 3
+            ? 1
+            : 0;
     folder.removePrivateCopies();
   }
   EXPECT_GE(ofOld, 3);

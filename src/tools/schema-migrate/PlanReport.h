@@ -23,8 +23,8 @@ struct DifferenceFilter {
 using ShownDifferences = std::vector<const migration::Verdict*>;
 ShownDifferences shownOf(const migration::MigrationPlan& plan, const DifferenceFilter& filter);
 
-// Of the names asked for, those that nothing in BASE, OLD or NEW has: a line each, with what may have
-// been meant.
+// Of the names asked for, those that nothing in BASE, OLD or NEW has: a line each, with what may
+// have been meant.
 std::string renderUnknownNames(const migration::MigrationPlan& plan,
                                const std::vector<std::string>& names);
 
