@@ -13,7 +13,8 @@ namespace {
 
 using std::string_literals::operator""s;
 
-const char kRefused[] = "schema-migrate: error: refused: nothing was written\n";
+const char kRefused[] =
+    "schema-migrate: error: refused: nothing was written; what can be mended without changing what is said, --repair mends in private copies; a .schema-migrate.toml in the directory accepts what is meant so\n";
 
 std::string told(const std::string& place, const std::string& text) {
   return "@/old/V3.user.at:" + place + ": error: " + text + "\n";

@@ -46,7 +46,7 @@ const Row kRows[] = {
     {"DescriptionOfAClass", "old/V3.user.oc", "objectclasses=( 1.9 NAME 'z' DESC '", 'x', "' )\n",
      0, ""},
     {"TextBetweenDefinitions", "old/V3.user.at", "'", 'x', "'\n", 4,
-     "that is meant [L109]\nschema-migrate: error: refused: nothing was written\n"},
+     "that is meant [L109]\nschema-migrate: error: refused: nothing was written; what can be mended without changing what is said, --repair mends in private copies; a .schema-migrate.toml in the directory accepts what is meant so\n"},
     {"StringThatIsNotClosed", "old/V3.user.at", "attributetypes=( 1.9 NAME 'z' DESC '", 'x', "", 3,
      "@/old/V3.user.at:1:#: error: the server's library fails to read this file, and stops here\n"},
 };

@@ -229,7 +229,7 @@ const Row kRows[] = {
      4,
      "@/old/V3.user.at:2:1: error: this definition has no OID, by which everything finds it; write a numeric OID behind its \"(\" [D205]\n"
      "@/new/V3.user.at:1:16: error: this definition has no OID, by which everything finds it; write a numeric OID behind its \"(\" [D205]\n"
-     "schema-migrate: error: refused: nothing was written\n"},
+     "schema-migrate: error: refused: nothing was written; what can be mended without changing what is said, --repair mends in private copies; a .schema-migrate.toml in the directory accepts what is meant so\n"},
     {"ChangeToAConfigDefinition",
      {{"V3.config.oc", "objectclasses=( 1.1 NAME 'a' STRUCTURAL )\n"}},
      {{"V3.config.oc", "objectclasses=( 1.1 NAME 'a' ABSTRACT )\n"}},
@@ -247,7 +247,7 @@ const Row kRows[] = {
      {{"V3.user.at", ""}},
      4,
      "@/old/V3.user.at:1:40: error: \"X-ORIGIN\" is no clause that the reader knows here, and it or its value takes the place of the OID; take it away, or make a comment of it [D201]\n"
-     "schema-migrate: error: refused: nothing was written\n"},
+     "schema-migrate: error: refused: nothing was written; what can be mended without changing what is said, --repair mends in private copies; a .schema-migrate.toml in the directory accepts what is meant so\n"},
     {"SameOidOfTwoKindsInNew",
      {{"V3.user.oc", ""}},
      {{"V3.user.oc",

@@ -285,59 +285,112 @@ TEST_F(Planned, ABaseThatEqualsOldIsDoubted) {
   EXPECT_EQ(run("diff", {"--base", "@/old", "--accept-base", "--stat"}).exitCode, 1);
 }
 
+// Referrer, clause, missing name, and what caused it.
 TEST_F(Planned, WhatTheResultWouldBreakIsRefused) {
+  m_folder.write("excluded", "# of the site\n9.1\n");
+  for (const char* const command : {"plan", "migrate"}) {
+    std::vector<std::string> more = {"--base", "@/base", "--exclude-oids", "@/excluded"};
+    if (std::string(command) == "migrate") {
+      more.insert(more.end(), {"--out", "@/out"});
+    }
+    const ToolResult result = run(command, more);
+    EXPECT_EQ(result.exitCode, 4);
+    EXPECT_NE(
+        result.err.find(
+            "result/V3.system.oc:1:59: error: MAY of object class c (2.1) names s, which is not in "
+            "the result: attribute type s (9.1) is excluded at @/excluded:2; decide otherwise about "
+            "one of the two (new in this result) [R401]\n"),
+        std::string::npos)
+        << result.err;
+    EXPECT_NE(
+        result.err.find(
+            "error: MAY of object class guard (9.2) names s, which is not in the result: attribute "
+            "type s (9.1) is excluded at @/excluded:2; decide otherwise about one of the two (new "
+            "in this result) [R401]\n"),
+        std::string::npos)
+        << result.err;
+  }
+  EXPECT_EQ(m_folder.names(), "base excluded new old");
+}
+
+TEST_F(Planned, WhatADecisionWouldBreakNamesTheDecision) {
+  m_folder.write("decisions.toml",
+                 "[[definition]]\nkind = \"attribute-type\"\nname = \"s\"\ntake = \"drop\"\n");
+  const ToolResult result = run("plan", {"--base", "@/base", "--decisions", "@/decisions.toml"});
+  EXPECT_EQ(result.exitCode, 4);
+  EXPECT_NE(result.err.find("names s, which is not in the result: attribute type s (9.1) is left "
+                            "out, as "),
+            std::string::npos)
+      << result.err;
+  EXPECT_NE(result.err.find(", decided at @/decisions.toml:1; decide otherwise"), std::string::npos)
+      << result.err;
+}
+
+// A name that the site's class refers to is another definition's in the result.
+TEST_F(Planned, ANameThatMeansSomethingElseIsRefused) {
+  m_folder.write("new/V3.user.at", at("7.1 NAME 's' SINGLE-VALUE USAGE userApplications"));
   m_folder.write("excluded", "9.1\n");
   const ToolResult result = run("plan", {"--base", "@/base", "--exclude-oids", "@/excluded"});
   EXPECT_EQ(result.exitCode, 4);
-  EXPECT_NE(result.err.find("[R401]"), std::string::npos) << result.err;
-  EXPECT_NE(result.err.find("(new in this result)"), std::string::npos) << result.err;
+  EXPECT_NE(result.err.find("error: MAY of object class guard (9.2) names s, which is attribute "
+                            "type s (9.1) in OLD and attribute type s (7.1) in the result"),
+            std::string::npos)
+      << result.err;
+  EXPECT_NE(result.err.find("(new in this result) [R404]\n"), std::string::npos) << result.err;
 }
 
-TEST_F(Planned, JsonHasWhatADefinitionSaysBesideItsDifferences) {
-  const ToolResult result = run("diff", {"a", "--base", "@/base", "--format", "json"});
-  EXPECT_NE(result.out.find("\"otherClauses\": [\n"
-                            "        {\n"
-                            "          \"clause\": \"OID\",\n"
-                            "          \"value\": \"1.1\"\n"
-                            "        },\n"
-                            "        {\n"
-                            "          \"clause\": \"NAME\",\n"
-                            "          \"value\": \"'a'\"\n"
-                            "        },\n"
-                            "        {\n"
-                            "          \"clause\": \"DESC\",\n"
-                            "          \"value\": \"'d'\"\n"
-                            "        },\n"
-                            "        {\n"
-                            "          \"clause\": \"USAGE\",\n"
-                            "          \"value\": \"userApplications\"\n"
-                            "        }\n"
-                            "      ]"),
-            std::string::npos)
-      << result.out;
+// ---- Before: what the library would read otherwise than it is written ----
+
+class LossyInput : public Planned {
+ protected:
+  LossyInput() {
+    m_folder.write("old/V3.user.oc", oc("9.2 NAME 'guard' SUP c STRUCTURAL MAY s") +
+                                         oc("9.3 NAME 'other' SUP c STRUCTURAL MAY ( s )"));
+  }
+  std::vector<std::string> withBase(std::vector<std::string> more) const {
+    more.insert(more.end(), {"--base", "@/base"});
+    return more;
+  }
+};
+
+TEST_F(LossyInput, Refuses) {
+  for (const char* const command : {"plan", "migrate"}) {
+    const ToolResult result = run(command, withBase(std::string(command) == "migrate"
+                                                        ? std::vector<std::string>{"--out", "@/out"}
+                                                        : std::vector<std::string>()));
+    EXPECT_TRUE(result.exitCode == 3 || result.exitCode == 4) << result.exitCode;
+    EXPECT_NE(result.err.find("@/old/V3.user.oc:1:"), std::string::npos) << result.err;
+    EXPECT_NE(result.err.find("[D208]\n"), std::string::npos) << result.err;
+  }
+  EXPECT_EQ(m_folder.names(), "base new old");
 }
 
-TEST_F(Planned, JsonHasTheSuperiorsAroundWhatChanges) {
-  // guard is asked for; its superior c is there, too, and e, which has nothing to do with it, not.
-  const ToolResult result = run("diff", {"guard", "--base", "@/base", "--format", "json"});
-  EXPECT_NE(result.out.find("\"superiors\": [\n"
-                            "    {\n"
-                            "      \"kind\": \"object-class\",\n"
-                            "      \"oid\": \"2.1\",\n"
-                            "      \"name\": \"c\",\n"
-                            "      \"superiors\": []\n"
-                            "    },\n"
-                            "    {\n"
-                            "      \"kind\": \"object-class\",\n"
-                            "      \"oid\": \"9.2\",\n"
-                            "      \"name\": \"guard\",\n"
-                            "      \"superiors\": [\n"
-                            "        \"c\"\n"
-                            "      ]\n"
-                            "    }\n"
-                            "  ]"),
-            std::string::npos)
-      << result.out;
+TEST_F(LossyInput, IsMendedInAPrivateCopy) {
+  const ToolFolder::Files before = m_folder.contents("old");
+  const ToolResult result = run("migrate", withBase({"--repair", "--out", "@/out"}));
+  EXPECT_EQ(result.err, "");
+  EXPECT_EQ(result.exitCode, 0);
+  EXPECT_NE(result.out.find("@/old/V3.user.oc:1:"), std::string::npos) << result.out;
+  EXPECT_NE(result.out.find(": mended in a private copy: "), std::string::npos) << result.out;
+  EXPECT_NE(m_folder.contents("out").at("V3.user.oc").find(" MAY ( s ) )\n"), std::string::npos);
+  EXPECT_EQ(m_folder.contents("old"), before);
+  EXPECT_EQ(run("plan", withBase({"--repair"})).exitCode, 0);
+}
+
+TEST_F(Planned, WhatTheSettingsAcceptIsNoRefusal) {
+  m_folder.write("old/V3.user.at", at("9.1 NAME 's' USAGE userApplications") + "a note\n");
+  const ToolResult refused = run("plan", {"--base", "@/base"});
+  EXPECT_EQ(refused.exitCode, 4);
+  EXPECT_NE(refused.err.find("@/old/V3.user.at:2:1: error: "), std::string::npos) << refused.err;
+  m_folder.write("old/.schema-migrate.toml",
+                 "[[accepted]]\nrule = \"L105\"\nfile = \"V3.user.at\"\nline = 2\n"
+                 "reason = \"a note of ours\"\n");
+  const ToolResult result = run("plan", {"--base", "@/base"});
+  EXPECT_EQ(result.err, "");
+  EXPECT_EQ(result.exitCode, 0);
+  // By place: at another line it is another one.
+  m_folder.write("old/V3.user.at", "\n" + at("9.1 NAME 's' USAGE userApplications") + "a note\n");
+  EXPECT_EQ(run("plan", {"--base", "@/base"}).exitCode, 4);
 }
 
 TEST_F(Planned, JsonFollowsItsSchema) {

@@ -90,7 +90,7 @@ TEST_F(SavedPlan, HoldsEveryOptionThatMatters) {
   const json plain = save()["options"];
   EXPECT_EQ(json::parse(m_folder.withPath(R"({"base": "@/base", "from": "@/old", "to": "@/new",
       "excludeOids": [], "withdraw": null, "decisions": [], "prefer": null, "acceptBase": false,
-      "allowUnused": false})")),
+      "allowUnused": false, "repair": false})")),
             plain);
   m_folder.write("e1", "# none\n");
   m_folder.write("e2", "# none\n");
@@ -103,7 +103,7 @@ TEST_F(SavedPlan, HoldsEveryOptionThatMatters) {
             "@/d.toml", "--allow-unused", "--accept-base", "--prefer", "old"})["options"];
   EXPECT_EQ(json::parse(m_folder.withPath(R"({"base": "@/base", "from": "@/old", "to": "@/new",
       "excludeOids": ["@/e1", "@/e2"], "withdraw": "@/w", "decisions": ["@/d.toml"],
-      "prefer": "old", "acceptBase": true, "allowUnused": true})")),
+      "prefer": "old", "acceptBase": true, "allowUnused": true, "repair": false})")),
             full);
 }
 

@@ -222,4 +222,20 @@ TEST(Settings, AnAcceptedFindingThatCannotOccurInThisRunIsNotTold) {
   EXPECT_EQ("", stale(kOne, false));
 }
 
+// Findings of other rules before the one that is accepted, as many as there may be.
+TEST(Judge, AcceptsWhateverComesBefore) {
+  migration::Settings settings;
+  settings.accepted.push_back({"L105", "V3.user.at", 2, "", "known", {}});
+  migration::Findings findings;
+  for (const char* const rule : {"R403", "T305", "D201", "L112", "A1", "Z9"}) {
+    findings.push_back({rule, Severity::kWarning, "d/V3.system.at", 1, 1, "text", ""});
+  }
+  findings.push_back({"L105", Severity::kError, "d/V3.user.at", 2, 1, "text", ""});
+  const migration::JudgedFindings judged =
+      judge(settings, findings, [](const migration::Acceptance&) { return true; });
+  EXPECT_EQ(6U, judged.findings.size());
+  ASSERT_EQ(1U, judged.accepted.size());
+  EXPECT_EQ("known", judged.accepted.front().reason);
+}
+
 }  // namespace

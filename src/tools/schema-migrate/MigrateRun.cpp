@@ -68,8 +68,13 @@ void report(const MigrationPlan& plan, const MigrateOptions& options, HtmlOption
 
 void refuseUnlessReady(const MigrationPlan& plan) {
   if (!plan.isReady()) {
+    const bool isLoss = plan.refusals.size() > plan.newInResult.size();
     const char* const advice =
-        plan.undecidedCount == 0
+        plan.undecidedCount == 0 && isLoss
+            ? "refused: nothing was written; what can be mended without changing what is said, "
+              "--repair mends in private copies; a .schema-migrate.toml in the directory accepts "
+              "what is meant so"
+        : plan.undecidedCount == 0
             ? "refused: nothing was written"
             : "refused: nothing was written; plan --template makes a file in which what is undecided "
               "can be decided";

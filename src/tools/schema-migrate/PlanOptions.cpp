@@ -78,6 +78,8 @@ void PlanOptions::declareInputs(CLI::App* command) {
   command->add_flag("--accept-base", request.acceptBase,
                     "BASE may equal OLD or NEW, as that of an installation never customised does");
   addMaxInput(command, &request.limits);
+  command->add_flag("--repair", request.isRepaired,
+                    "mend in private copies what can be mended without changing what is said");
 }
 
 void PlanOptions::declareDecisions(CLI::App* command) {
@@ -184,6 +186,9 @@ std::vector<std::string> PlanOptions::words() const {
   add("--withdraw", request.withdrawList);
   for (const std::string& file : request.decisions) {
     add("--decisions", file);
+  }
+  if (request.isRepaired) {
+    words.emplace_back("--repair");
   }
   if (request.allowUnused) {
     words.emplace_back("--allow-unused");

@@ -271,7 +271,14 @@ std::string renderFindings(const MigrationPlan& plan) {
                  ? errorLine(placeTold(finding), textTold(finding))
                  : warningLine(placeTold(finding), textTold(finding));
   }
-  return lines.empty() ? "" : "What check says of the inputs:\n" + lines + "\n";
+  std::string repairs;
+  for (const migration::Finding& repair : plan.repairs) {
+    repairs +=
+        wholePrintable(placeTold(repair) + ": mended in a private copy: " + textTold(repair)) +
+        "\n";
+  }
+  return (repairs.empty() ? "" : repairs + "\n") +
+         (lines.empty() ? "" : "What check says of the inputs:\n" + lines + "\n");
 }
 
 std::string warningsOf(const MigrationPlan& plan) {

@@ -37,7 +37,8 @@ struct PlanStyle {
 std::string renderDifferences(const migration::MigrationPlan& plan, const ShownDifferences& shown,
                               const PlanStyle& style);
 
-// What the rules of check say of the inputs, a line each; empty when they say nothing.
+// What was mended in private copies of the inputs, and what the rules of check say of them, a line
+// each; empty when there is nothing.
 std::string renderFindings(const migration::MigrationPlan& plan);
 
 // A line for each definition that counts for nothing, and for each file that is not read, for

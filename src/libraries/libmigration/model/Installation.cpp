@@ -106,6 +106,7 @@ Installation Installation::fromTexts(const std::string& directory, std::vector<N
     }
     rest.used += text->bytes.size();
     content->addFile(name, std::move(path), std::move(text->bytes));
+    content->files.back().mode = text->mode;
   }
   std::sort(content->otherFiles.begin(), content->otherFiles.end());
   return Installation(std::move(content));

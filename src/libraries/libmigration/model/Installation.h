@@ -73,6 +73,7 @@ struct Reference {
 struct NamedText {
   std::string name;
   std::string bytes;
+  unsigned mode = 0;  // of the file, where it has one
 };
 
 class Installation {

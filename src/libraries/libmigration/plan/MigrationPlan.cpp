@@ -1,6 +1,9 @@
 #include "MigrationPlan.h"
 
+#include <sys/stat.h>
+
 #include <algorithm>
+#include <iterator>
 #include <map>
 #include <set>
 #include <tuple>
@@ -11,46 +14,23 @@
 #include "Digest.h"
 #include "InputFiles.h"
 #include "OidList.h"
+#include "Repair.h"
+#include "ResultCheck.h"
+#include "Settings.h"
 #include "Staging.h"
 
 namespace migration {
 
 namespace {
 
-Findings checked(const Installation& installation) {
-  CheckRequest request;
-  request.installation = &installation;
-  return check(request);
-}
-
-std::string keyOf(const Finding& finding) { return finding.rule + finding.definition; }
-
-// A reference that dangles, a name that is another one's now, two definitions with one name: what
-// only warns about a habit of writing breaks nothing.
-bool isBroken(const Finding& finding) {
-  const bool isHarmless = finding.rule == "R405" || finding.rule == "T305" ||
-                          finding.rule == "T306" || finding.rule == "T307";
-  const char family = finding.rule.front();
-  return finding.severity == Severity::kError ||
-         ((family == 'T' || family == 'R' || family == 'V') && !isHarmless);
-}
-
 void checkResult(MigrationPlan* plan) {
   plan->resultTexts = inNewsLayout(plan->request, plan->threeWay);
   plan->result =
       Installation::fromTexts("result", plan->resultTexts, ReadLimits::none(), &plan->refusals);
-  std::map<std::string, std::size_t> seen;
-  for (Finding& finding : checked(*plan->result)) {
-    const std::string key = keyOf(finding);
-    const auto known = plan->knownFindings.find(key);
-    const bool isKnown = ++seen[key] <= (known == plan->knownFindings.end() ? 0 : known->second);
-    if (isKnown || !isBroken(finding)) {
-      continue;
-    }
-    finding.severity = Severity::kError;
-    plan->refusals.push_back({finding.file, finding.line, finding.column, finding.rule,
-                              finding.text + " (new in this result)"});
-    plan->newInResult.push_back(std::move(finding));
+  plan->newInResult = newInResult(*plan);
+  for (const Finding& finding : plan->newInResult) {
+    plan->refusals.push_back(
+        {finding.file, finding.line, finding.column, finding.rule, finding.text});
   }
 }
 
@@ -126,11 +106,46 @@ class PlanMaker {
     m_limits.used += installation.size();
     for (const SchemaFile& file : installation.files()) {
       note(role, *file.source);
+    }
+    readSettings(directory);
+    if (m_request.isRepaired) {
+      installation = repaired(installation);
+    }
+    for (const SchemaFile& file : installation.files()) {
       if (file.kept->ending() != ReadingEnd::kWhole) {
         failToRead(file);
       }
     }
     return installation;
+  }
+
+  // What an installation says of its own findings, if it does.
+  void readSettings(const std::string& directory) {
+    const std::string path = directory + "/" + kSettingsFile;
+    struct stat status {};
+    Settings& settings = m_settings[directory];
+    if (::stat(path.c_str(), &status) != 0) {
+      return;
+    }
+    if (const Source* const source = readFile("settings", path)) {
+      settings = migration::readSettings(*source, &m_plan->failures);
+    }
+  }
+
+  // A copy in which is mended what can be, and whose places are those of the mended text.
+  Installation repaired(const Installation& installation) {
+    std::vector<NamedText> texts;
+    for (const SchemaFile& file : installation.files()) {
+      Repair repair = migration::repair(*file.written);
+      for (RepairedPlace& change : repair.changes) {
+        m_plan->repairs.push_back({std::move(change.rule), Severity::kWarning, file.source->path(),
+                                   change.place.line, change.place.column, std::move(change.text),
+                                   ""});
+      }
+      texts.push_back({file.name, std::move(repair.bytes), file.mode});
+    }
+    return Installation::fromTexts(installation.directory(), std::move(texts), ReadLimits::none(),
+                                   &m_plan->failures);
   }
 
   // What is wrong with the text up to there, and then that the library does not get past it.
@@ -169,6 +184,7 @@ class PlanMaker {
   const Source* readList(const char* role, const std::string& path, std::set<std::string>* oids) {
     const Source* const source = readFile(role, path);
     if (source != nullptr) {
+      m_plan->oidLists.push_back(source);
       for (const OidWord& word : readOidList(*source)) {
         if (word.use == WordUse::kTaken) {
           oids->emplace(word.text);
@@ -187,7 +203,9 @@ class PlanMaker {
   void checkInputs() {
     if (m_plan->base) {
       tell("checking BASE");
-      add(checked(*m_plan->base));
+      CheckRequest request;
+      request.installation = &*m_plan->base;
+      addFindings(request, m_request.base, false);
     }
     tell("checking OLD");
     CheckRequest request;
@@ -195,29 +213,30 @@ class PlanMaker {
     request.against = &*m_plan->latest;
     request.excludeLists = m_excludeLists;
     request.withdrawList = m_withdrawList;
-    countAndAdd(check(request));
+    addFindings(request, m_request.old, true);
     tell("checking NEW");
-    countAndAdd(checked(*m_plan->latest));
+    CheckRequest ofNew;
+    ofNew.installation = &*m_plan->latest;
+    addFindings(ofNew, m_request.latest, true);
   }
 
-  void add(Findings findings) {
-    for (Finding& finding : findings) {
-      refuseLoss(finding);
-      m_plan->ofInputs.push_back(std::move(finding));
-    }
-  }
-
-  // The result may have what OLD or NEW has.
-  void countAndAdd(Findings findings) {
+  // Those that the directory's settings accept do not refuse. The result may have what OLD or NEW
+  // has.
+  void addFindings(const CheckRequest& request, const std::string& directory, bool mayBeInResult) {
+    JudgedFindings judged = checkWithSettings(request, m_settings[directory], true);
     std::map<std::string, std::size_t> counts;
-    for (const Finding& finding : findings) {
+    for (const Finding& finding : judged.findings) {
       ++counts[keyOf(finding)];
+      refuseLoss(finding);
+    }
+    for (const AcceptedFinding& accepted : judged.accepted) {
+      ++counts[keyOf(accepted.finding)];
     }
     for (const auto& [key, count] : counts) {
       std::size_t& known = m_plan->knownFindings[key];
-      known = std::max(known, count);
+      known = mayBeInResult ? std::max(known, count) : known;
     }
-    add(std::move(findings));
+    std::move(judged.findings.begin(), judged.findings.end(), std::back_inserter(m_plan->ofInputs));
   }
 
   // What the library's reading loses must not get lost unseen.
@@ -249,6 +268,7 @@ class PlanMaker {
 
   const PlanRequest& m_request;
   ReadLimits m_limits;
+  std::map<std::string, Settings> m_settings;  // by directory
   std::unique_ptr<MigrationPlan> m_plan;
   std::vector<const Source*> m_excludeLists;
   const Source* m_withdrawList = nullptr;

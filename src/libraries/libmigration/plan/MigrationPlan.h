@@ -31,6 +31,7 @@ struct PlanRequest {
   Prefer prefer = Prefer::kNothing;
   bool allowUnused = false;  // decisions that match nothing
   bool acceptBase = false;   // a BASE that equals OLD, or NEW
+  bool isRepaired = false;   // what can be mended is mended, in memory
   ReadLimits limits;
   // Called with what is done next, as in "reading OLD": a plan of many definitions takes its time.
   std::function<void(const char* step)> onStep;
@@ -38,7 +39,7 @@ struct PlanRequest {
 
 // A file that the plan was made from.
 struct PlanInput {
-  std::string role;  // "base", "old", "new", "exclude", "withdraw", "decisions"
+  std::string role;  // "base", "old", "new", "settings", "exclude", "withdraw", "decisions"
   std::string path;
   std::string sha256;
 };
@@ -48,8 +49,11 @@ struct MigrationPlan {
   std::vector<PlanInput> inputs;
   ThreeWay threeWay;
 
+  // What was mended, at its places in the files. Everything else is of the mended texts.
+  Findings repairs;
+
   // What the rules say of BASE, OLD and NEW, of the lists, and of the result what neither OLD nor
-  // NEW had.
+  // NEW had. What the settings of a directory accept is left out.
   Findings ofInputs;
   Findings newInResult;
 
@@ -68,6 +72,7 @@ struct MigrationPlan {
   std::optional<Installation> old;
   std::optional<Installation> latest;
   std::vector<std::unique_ptr<Source>> lists;
+  std::vector<const Source*> oidLists;
 
   // How often OLD or NEW has what the rules find, by rule and definition; the result may, too.
   std::map<std::string, std::size_t> knownFindings;

@@ -89,8 +89,9 @@ class RecordMaker {
       if (input.role == "base" || input.role == "old" || input.role == "new") {
         continue;
       }
-      const std::string name = input.role + "-" + std::to_string(++counts[input.role]) +
-                               (input.role == "decisions" ? ".toml" : ".txt");
+      const std::string name =
+          input.role + "-" + std::to_string(++counts[input.role]) +
+          (input.role == "decisions" || input.role == "settings" ? ".toml" : ".txt");
       add("lists", name, std::string((*source++)->bytes()));
       m_copied += "lists/" + name + ": a copy of " + quoted(input.path) + "\n";
     }

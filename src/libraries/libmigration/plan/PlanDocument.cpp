@@ -172,7 +172,8 @@ Json optionsOf(const PlanRequest& asked) {
           {"decisions", asked.decisions},
           {"prefer", prefer},
           {"acceptBase", asked.acceptBase},
-          {"allowUnused", asked.allowUnused}};
+          {"allowUnused", asked.allowUnused},
+          {"repair", asked.isRepaired}};
 }
 
 Json inputsOf(const MigrationPlan& plan) {
@@ -221,6 +222,7 @@ std::string planDocument(const MigrationPlan& plan, const std::vector<const Verd
       {"outputs", outputsOf(plan)},
       {"definitions", definitions},
       {"superiors", superiorsOf(plan, shown)},
+      {"repairs", findingsOf(plan.repairs)},
       {"findings", findingsOf(plan.ofInputs)},
       {"newInResult", findingsOf(plan.newInResult)},
       {"refusals", failuresOf(plan.refusals)},

@@ -198,6 +198,7 @@ PlanRequest requestOf(const Value& options) {
   request.prefer = preferOf(options.member("prefer"));
   request.acceptBase = options.member("acceptBase").boolean();
   request.allowUnused = options.member("allowUnused").boolean();
+  request.isRepaired = options.member("repair").boolean();
   return request;
 }
 

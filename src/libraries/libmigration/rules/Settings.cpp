@@ -295,10 +295,13 @@ JudgedFindings judge(const Settings& settings, Findings findings,
   }
   for (Finding& finding : findings) {
     const Acceptance* by = nullptr;
-    for (const std::size_t index : byRule[finding.rule]) {
-      if (fits(settings.accepted[index], finding)) {
-        by = &settings.accepted[index];
-        isUsed[index] = true;
+    // The keys refer to the settings: that of a finding, which moves, must not become one.
+    if (const auto ofRule = byRule.find(finding.rule); ofRule != byRule.end()) {
+      for (const std::size_t index : ofRule->second) {
+        if (fits(settings.accepted[index], finding)) {
+          by = &settings.accepted[index];
+          isUsed[index] = true;
+        }
       }
     }
     if (by == nullptr) {
