@@ -106,8 +106,9 @@ void PlanOptions::declarePlan(CLI::App* command) {
       ->check(notEmpty())
       ->type_name("PLAN");
   std::vector<const CLI::Option*> replaced;
-  for (const char* const name : {"--from", "--to", "--base", "--accept-base", "--exclude-oids",
-                                 "--withdraw", "--decisions", "--allow-unused", "--prefer"}) {
+  for (const char* const name :
+       {"--from", "--to", "--base", "--accept-base", "--exclude-oids", "--withdraw", "--decisions",
+        "--allow-unused", "--prefer", "--repair"}) {
     CLI::Option* const option = command->get_option(name);
     option->required(false);
     replaced.push_back(option);
