@@ -627,14 +627,20 @@ TEST(ThreeWay, WhatHasToStayNewsIsUndecidedWhereTheSiteChangedIt) {
        {{"V3.user.at", kPlain}, {"V3.config.at", kPlain}},
        {{"V3.user.at", renumbered}},
        "attribute type a (9.1): changed by site, renumbered -> undecided (NEW's OID and first name "
-       "have to stay, because of attribute type a (1.1) of V3.config.at:1 in NEW, which would come "
-       "up in its place)\n"},
+       "have to stay, because of attribute type a (1.1) of V3.config.at:1 in NEW, which has one of "
+       "them too)\n"},
       {"AnotherOfTheFirstNameThatTheSiteRenumbered",
        {{"V3.system.at", kPlain}, {"V3.user.at", at("1.2 NAME 'A' USAGE v")}},
        {{"V3.user.at", renumbered}},
        "attribute type a (9.1): changed by site, renumbered -> undecided (NEW's OID and first name "
-       "have to stay, because of attribute type A (1.2) of V3.user.at:1 in NEW, which would come "
-       "up in its place)\n"},
+       "have to stay, because of attribute type A (1.2) of V3.user.at:1 in NEW, which has one of "
+       "them too)\n"},
+      {"AnObjectClassOfTheOidOfWhatTheSiteRenamed",
+       {{"V3.user.at", kPlain + oc("1.1 NAME 'c' ABSTRACT")}},
+       {{"V3.user.at", at("1.1 NAME 'b' DESC 'd' USAGE u") + oc("1.1 NAME 'c' ABSTRACT")}},
+       "attribute type b (1.1): changed by site, renamed -> undecided (NEW's OID and first name "
+       "have to stay, because of object class c (1.1) of V3.user.at:2 in NEW, which has one of "
+       "them too)\n"},
       {"TheSecondOfAnOid",
        {{"V3.user.at", kPlain + at("1.1 NAME 'b' USAGE u")}},
        {{"V3.user.at", kPlain + at("1.1 NAME 'b' USAGE site")}},

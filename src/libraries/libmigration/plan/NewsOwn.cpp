@@ -121,6 +121,12 @@ class NewsOwn {
         return found->second;
       }
     }
+    // An OID that both kinds have is in two files, whatever becomes of one of the two.
+    const Kind other =
+        row.kind() == Kind::kAttributeType ? Kind::kObjectClass : Kind::kAttributeType;
+    if (const Entry* const shared = m_latest.byOid(other, oidOf(latest))) {
+      return shared;
+    }
     if (row.kind() == Kind::kAttributeType) {
       const auto found = m_behind.find(keyOf(Kind::kVendorExtension, oidOf(latest)));
       return found == m_behind.end() ? nullptr : found->second;
@@ -163,7 +169,7 @@ bool hasOtherIdentity(const Content& content, const Entry& latest) {
 
 std::string whyIdentityStays(const Verdict& row) {
   return "NEW's OID and first name have to stay, because of " + describeWithPlace(*row.behind) +
-         " in NEW, which would come up in its place";
+         " in NEW, which has one of them too";
 }
 
 void keepNewsOwn(const Installation& latest, const std::vector<const Entry*>& uncountedOfNew,

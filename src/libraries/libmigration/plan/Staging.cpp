@@ -143,7 +143,7 @@ class Places {
     if (row.match.latest != nullptr && !row.isNewsInTheWay) {
       return row.match.latest->file->name;
     }
-    const std::string file = fileOfType(row);
+    std::string file = fileOfType(row);
     if (!file.empty()) {
       return file;
     }
