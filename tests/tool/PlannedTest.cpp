@@ -297,7 +297,7 @@ TEST_F(Planned, WhatTheResultWouldBreakIsRefused) {
     EXPECT_EQ(result.exitCode, 4);
     EXPECT_NE(
         result.err.find(
-            "result/V3.system.oc:1:59: error: MAY of object class c (2.1) names s, which is not in "
+            "result/V3.system.oc:1:55: error: MAY of object class c (2.1) names s, which is not in "
             "the result: attribute type s (9.1) is excluded at @/excluded:2; decide otherwise about "
             "one of the two (new in this result) [R401]\n"),
         std::string::npos)
