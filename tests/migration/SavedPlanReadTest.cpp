@@ -23,7 +23,7 @@ std::string document() {
          "    \"/e2\"],\n"                                                        // 8
          "  \"withdraw\": \"/w\", \"decisions\": [\"/d\"],\n"                     // 9
          "  \"prefer\": \"new\",\n"                                               // 10
-         "  \"acceptBase\": true, \"allowUnused\": false, \"repair\": false},\n"                     // 11
+         "  \"acceptBase\": true, \"allowUnused\": false, \"repair\": false},\n"  // 11
          "\"inputs\": [{\"role\": \"old\", \"path\": \"/old/V3.user.at\",\n"      // 12
          "  \"sha256\": \"" +
          kDigest +
