@@ -102,7 +102,9 @@ TEST(Installation, TellsReferences) {
 
 class Directory : public testing::Test {
  protected:
-  Directory() : m_path(testing::TempDir() + "model-XXXXXX") { ::mkdtemp(m_path.data()); }
+  Directory() : m_path(testing::TempDir() + "model-XXXXXX") {
+    EXPECT_NE(nullptr, ::mkdtemp(m_path.data()));
+  }
   ~Directory() override { std::filesystem::remove_all(m_path); }
 
   void write(const std::string& name, const std::string& text) const {
