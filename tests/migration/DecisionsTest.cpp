@@ -238,6 +238,10 @@ TEST(Decisions, WhatCannotBeCarriedOut) {
       "out: ";
   const Inputs kinds = {oc("2.1 NAME 'c' ABSTRACT"), oc("2.1 NAME 'c' STRUCTURAL"),
                         oc("2.1 NAME 'c' AUXILIARY")};
+  const Inputs superiors = {at("1.1 NAME 'a' SUP p"), at("1.1 NAME 'a' SUP q"),
+                            at("1.1 NAME 'a' SUP r")};
+  const std::string cannotForType =
+      "d.toml:1: the decision about attribute type a (1.1) cannot be carried out: ";
   expectDecided({
       {"NoDefinition", kConflict, about("object-class", "d", "take = \"old\""),
        undecided + "d.toml:1: it matches no definition of BASE, OLD or NEW; remove it, or allow "
@@ -257,6 +261,14 @@ TEST(Decisions, WhatCannotBeCarriedOut) {
        undecided + cannot + "SYNTAX is no clause of an object class\n"},
       {"NoUnionOfAKind", kinds, about("object-class", "c", "clauses = { KIND = \"union\" }"),
        undecided + cannot + "KIND is no list, and has no union\n"},
+      {"NoUnionOfTheOneSuperiorOfAnAttributeType", superiors,
+       about("attribute-type", "a", "clauses = { SUP = \"union\" }"),
+       "attribute type a (1.1) -> undecided\n" + cannotForType +
+           "SUP is no list, and has no union\n"},
+      {"NoMergeOfTheOneSuperiorOfAnAttributeType", superiors,
+       about("attribute-type", "a", "take = \"merged\""),
+       "attribute type a (1.1) -> undecided\n" + cannotForType +
+           "it cannot be merged: SUP was changed in two ways; decide it by \"clauses\"\n"},
       {"AClauseIsLeft", kConflict, about("object-class", "c", "clauses = { MAY = \"new\" }"),
        undecided + cannot + "it leaves undecided: SUP\n"},
       {"NotMergeable", kinds, about("object-class", "c", "take = \"merged\""),

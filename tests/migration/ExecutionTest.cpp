@@ -179,6 +179,10 @@ TEST(Execution, NewsOwnRepeatsStay) {
       {"TwoUnderBoth", type + "attributetypes=( 1.1 NAME 'a' USAGE v )\n",
        "result: attribute type a (1.1) of V3.system.at:2 in NEW is not in the result\n"},
       {"TwoAlike", type + type, ""},
+      {"AnOidThatIsReadInTwo", type + "objectclasses=( 2.1 NAME 'c' ABSTRACT X-ORIGIN 'of2.1' )\n",
+       "result: object class c (of2.1) is not in the result\n"},
+      {"TwoSuperiors", type + "attributetypes=( 1.3 NAME 'd' SUP a SUP x USAGE u )\n",
+       "result: attribute type d (1.3) is not in the result\n"},
   };
   const std::string sites = "attributetypes=( 9.1 NAME 'mine' USAGE u )\n";
   for (const auto& row : cases) {

@@ -323,6 +323,16 @@ std::string Generator::textOf(const Definition& definition) {
     text += definition.length == 0 ? "" : "LENGTH " + std::to_string(definition.length) + " ";
     text += definition.flags;
   }
+  if (m_isHard && definition.kind != Kind::kVendorExtension && isOneOf(12)) {
+    // The value of a clause that the reader does not know becomes the OID.
+    const bool isOther = definition.kind == Kind::kObjectClass && isOneOf(3);
+    text +=
+        "X-ORIGIN '" +
+        (isOther ? "RFC" + definition.oid.substr(definition.oid.find('.') + 1) : definition.oid) +
+        "' ";
+  } else if (isOneOf(12)) {
+    text += "# X-ORIGIN 'RFC'\n";
+  }
   return text + ")";
 }
 

@@ -305,6 +305,7 @@ const Row kRows[] = {
     {"UsageThatIsANumber", "USAGE '12'"},
     {"ValueThatNeverEnds", "EQUALITY 'a COLLECTIVE b'"},
     {"ValueThatBeginsAnother", "SYNTAX 'a attributetypes b'"},
+    {"TwoSuperiors", "SUP b SUP c"},
     {"ValueWithARemark", "EQUALITY '1.2 # y'"},
     {"ValueThatCloses", "EQUALITY 'a ) b'"},
     {"ValueThatOpensABlock", "EQUALITY 'a ) attributetypes { ( 3.3'"},

@@ -156,11 +156,6 @@ std::optional<Aspect> aspectOf(Kind kind, const std::string& word) {
                                                     : std::nullopt;
 }
 
-bool isList(Aspect aspect) {
-  return aspect == Aspect::kAliases || aspect == Aspect::kMust || aspect == Aspect::kMay ||
-         aspect == Aspect::kSup;
-}
-
 // Carries one decision out on its row. Every function returns what is wrong, or "".
 class Carrying {
  public:
@@ -266,13 +261,13 @@ class Carrying {
 
   std::string takeMerged() {
     for (const ClauseChange& change : m_row.clauses) {
-      if (change.isInConflict && !change.isDecided && !isList(change.aspect)) {
+      if (change.isInConflict && !change.isDecided && !isList(m_row.kind(), change.aspect)) {
         return "it cannot be merged: " + std::string(nameOf(change.aspect)) +
                " was changed in two ways; decide it by \"clauses\"";
       }
     }
-    return merge([](const ClauseChange& change) {
-      return change.isInConflict && isList(change.aspect)
+    return merge([this](const ClauseChange& change) {
+      return change.isInConflict && isList(m_row.kind(), change.aspect)
                  ? std::optional<Values>(unionOf(change.old, change.latest))
                  : std::nullopt;
     });
@@ -290,7 +285,7 @@ class Carrying {
       if (take == Take::kBase && m_row.match.base == nullptr) {
         return "BASE does not have it";
       }
-      if (take == Take::kUnion && !isList(*aspect)) {
+      if (take == Take::kUnion && !isList(m_row.kind(), *aspect)) {
         return word + " is no list, and has no union";
       }
       const auto [place, isNew] = takes.emplace(static_cast<int>(*aspect), take);

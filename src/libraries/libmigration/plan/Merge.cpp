@@ -96,6 +96,10 @@ std::string_view wordOf(Risk risk) {
   return kWords[static_cast<std::size_t>(risk)];
 }
 
+bool isList(Kind kind, Aspect aspect) {
+  return isMemberList(aspect) || (aspect == Aspect::kSup && kind == Kind::kObjectClass);
+}
+
 Values unionOf(const Values& old, const Values& latest) { return mergedMembers({}, old, latest); }
 
 Risk riskOf(Aspect aspect, const Values& from, const Values& to) {

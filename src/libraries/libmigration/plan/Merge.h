@@ -56,6 +56,9 @@ Merge mergeWithoutBase(const Content& old, const Content& latest, Prefer prefer)
 // is not one that may; the clause that loses a member is told. `base` may be null.
 void dropRepeated(const Content* base, const Content& old, const Content& latest, Merge* merge);
 
+// Whether the clause is a list, of which there is a union. An attribute type has one superior.
+bool isList(Kind kind, Aspect aspect);
+
 // NEW's members in their order and what OLD has beside them, in OLD's order, at the end.
 Values unionOf(const Values& old, const Values& latest);
 

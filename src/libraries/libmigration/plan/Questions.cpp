@@ -11,11 +11,6 @@ namespace migration {
 
 namespace {
 
-bool isList(Aspect aspect) {
-  return aspect == Aspect::kAliases || aspect == Aspect::kMust || aspect == Aspect::kMay ||
-         aspect == Aspect::kSup;
-}
-
 bool goesWithAnUndecidedAttribute(const Verdict& row, const MigrationPlan& plan) {
   return row.kind() == Kind::kVendorExtension && row.match.attribute != kNoRow &&
          plan.threeWay.differences[row.match.attribute].isUndecided() &&
@@ -30,7 +25,7 @@ std::vector<Take> takesOf(const ClauseChange& change, const MatchRow& match) {
       !areEqual(aspect, change.base, change.latest)) {
     takes.push_back(Take::kBase);
   }
-  if (isList(aspect)) {
+  if (isList(match.kind, aspect)) {
     const Values both = unionOf(change.old, change.latest);
     if (!areEqual(aspect, both, change.old) && !areEqual(aspect, both, change.latest)) {
       takes.push_back(Take::kUnion);
