@@ -388,6 +388,61 @@ TEST(Decisions, AStaleFingerprintIsThatOfOtherTexts) {
             "object class c (2.1) -> new by d.toml:1\n");
 }
 
+// A file that serves many installations has an entry for each way in which they have a definition.
+TEST(Decisions, OfTwoForOneDefinitionTheOneForItsTextsHolds) {
+  const Installation base = installationOf("BASE", kConflict.base);
+  const Installation old = installationOf("OLD", kConflict.old);
+  const Installation latest = installationOf("NEW", kConflict.latest);
+  ThreeWayRequest request;
+  request.base = &base;
+  request.old = &old;
+  request.latest = &latest;
+  const std::string fingerprint = fingerprintOf(compareThreeWay(request).differences.front());
+  const std::string ours =
+      about("object-class", "c", "take = \"new\"\nfingerprint = \"" + fingerprint + "\"");
+  const std::string theirs =
+      about("object-class", "c", "take = \"old\"\nfingerprint = \"sha256:1\"");
+  EXPECT_EQ(decided(kConflict, theirs + ours, true), "object class c (2.1) -> new by d.toml:6\n");
+  EXPECT_EQ(decided(kConflict, ours + theirs, true), "object class c (2.1) -> new by d.toml:1\n");
+  EXPECT_EQ(decided(kConflict, theirs, true), "object class c (2.1) -> undecided\n");
+  EXPECT_EQ(decided(kConflict, theirs + ours),
+            "object class c (2.1) -> undecided\n"
+            "d.toml:1: the decision about object class c (2.1) is stale: the definition has "
+            "changed since it was made; look at it again, and make it anew\n"
+            "d.toml:6: the decision about object class c (2.1) contradicts the one at d.toml:1; "
+            "keep one of them\n");
+}
+
+TEST(Decisions, ThatAreForOtherTextsAreNoted) {
+  const Installation old = installationOf("OLD", at("1.1 NAME 'a' USAGE u"));
+  const Installation latest = installationOf("NEW", at("1.1 NAME 'a' USAGE v"));
+  ThreeWayRequest request;
+  request.old = &old;
+  request.latest = &latest;
+  request.allowUnused = true;
+  const auto notesWith = [&](const std::string& toml) {
+    const migration::Source source("d.toml", toml);
+    migration::Failures malformed;
+    request.decisions.clear();
+    readDecisions(source, &request.decisions, &malformed);
+    EXPECT_TRUE(malformed.empty());
+    const ThreeWay result = compareThreeWay(request);
+    std::string notes;
+    for (const std::string& note : result.differences.front().notes) {
+      notes += note + "\n";
+    }
+    return notes;
+  };
+  const std::string other =
+      about("attribute-type", "a", "take = \"old\"\nfingerprint = \"sha256:1\"");
+  EXPECT_EQ("a decision about it, made for other texts than these, is not used: d.toml:1\n",
+            notesWith(other));
+  EXPECT_EQ(
+      "2 decisions about it, made for other texts than these, are not used; the first: d.toml:1\n",
+      notesWith(other + other));
+  EXPECT_EQ("", notesWith(other + about("attribute-type", "a", "take = \"old\"")));
+}
+
 const Inputs kTaken = {"",
                        at("9.1 NAME 'badge' USAGE u") + orv("9.1 DBNAME ( 'b' )") +
                            at("9.2 NAME 'sub' SUP badge USAGE u") +

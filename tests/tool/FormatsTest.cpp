@@ -237,4 +237,56 @@ INSTANTIATE_TEST_SUITE_P(Runs, Formats,
                                                 EXAMPLES "/decisions.toml"}}),
                          [](const auto& row) { return row.param.name; });
 
+// ---- Questions ----
+
+// The lines of a template's entry that offer something, as the document's question has them.
+std::string offered(const Json& definition) {
+  const Json& question = definition["question"];
+  std::string takes;
+  for (const Json& take : question["take"]) {
+    takes += (takes.empty() ? "\"" : " or \"") + take.get<std::string>() + "\"";
+  }
+  std::string clauses;
+  for (const Json& clause : question["clauses"]) {
+    clauses += (clauses.empty() ? "" : ", ") + clause["clause"].get<std::string>() + " = \"\"";
+  }
+  const std::string by = question["by"];
+  return "kind = \"" + definition["kind"].get<std::string>() + "\"\n" + by + " = \"" +
+         definition[by].get<std::string>() + "\"\nfingerprint = \"" +
+         definition["fingerprint"].get<std::string>() + "\"\n# take: " + takes + "\n" +
+         (clauses.empty()
+              ? ""
+              : "# or, clause by clause (old, new, base, of lists union):\n# clauses = { " +
+                    clauses + " }\n") +
+         (question["move"] ? "# or, beside NEW's: rename = \"\", renumber = \"\"\n" : "") +
+         "reason = \"\"\n";
+}
+
+TEST(Questions, OfTheDocumentAreThoseOfTheTemplate) {
+  const ToolFolder folder;
+  const Json document =
+      Json::parse(folder
+                      .run({"plan", "--base", EXAMPLES "/base", "--from", EXAMPLES "/old", "--to",
+                            EXAMPLES "/new", "--template", "@/template", "--format", "json"})
+                      .out);
+  std::string text = support::readWholeFile(folder.file("template"));
+  std::size_t count = 0;
+  for (const Json& definition : document["definitions"]) {
+    if (definition["question"].is_null()) {
+      continue;
+    }
+    EXPECT_EQ("undecided", definition["outcome"]);
+    const std::size_t at = text.find(offered(definition));
+    EXPECT_NE(std::string::npos, at) << offered(definition) << "is not in\n" << text;
+    ++count;
+  }
+  // All but the extension that one decision about its attribute type covers.
+  EXPECT_EQ(10U, count);
+  std::size_t entries = 0;
+  for (std::size_t at = 0; (at = text.find("[[definition]]", at)) != std::string::npos; ++at) {
+    ++entries;
+  }
+  EXPECT_EQ(count, entries);
+}
+
 }  // namespace

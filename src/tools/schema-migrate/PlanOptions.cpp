@@ -92,7 +92,7 @@ void PlanOptions::declareDecisions(CLI::App* command) {
   addList(command, "--decisions", &request.decisions, "FILE", "what was decided about definitions")
       ->check(notEmpty());
   command->add_flag("--allow-unused", request.allowUnused,
-                    "decisions may be about definitions that none of the three has");
+                    "decisions may be about definitions, or texts of them, that are not here");
   command
       ->add_option("--prefer", m_prefer, "decide clauses that were changed in two ways: old or new")
       ->check(oneOf({"old", "new"}))

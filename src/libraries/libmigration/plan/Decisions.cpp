@@ -458,6 +458,7 @@ class Applying {
              "that match nothing");
       }
     }
+    noteUnfit();
     checkResult();
     followIdentities();
   }
@@ -493,7 +494,31 @@ class Applying {
     m_failures.push_back({decision.file, decision.line, 1, "", text});
   }
 
+  // Of a file for many installations there may be an entry for each way in which they have a
+  // definition.
+  bool isForAnother(const Decision& decision) const {
+    return m_request.allowUnused && m_stale.count(&decision) != 0;
+  }
+
+  void noteUnfit() {
+    for (const auto& [row, decisions] : m_unfit) {
+      if (m_made.count(row) == 0) {
+        m_rows[row].notes.push_back(
+            (decisions.size() == 1
+                 ? "a decision about it, made for other texts than these, is not used: "
+                 : std::to_string(decisions.size()) +
+                       " decisions about it, made for other texts than these, are not used; the "
+                       "first: ") +
+            placeOf(*decisions.front()));
+      }
+    }
+  }
+
   void carryOut(const Decision& decision, std::size_t row) {
+    if (isForAnother(decision)) {
+      m_unfit[row].push_back(&decision);
+      return;
+    }
     const auto [made, isNew] = m_made.emplace(row, &decision);
     const std::string who = "the decision about " + describe(m_rows[row]);
     if (!isNew) {
@@ -568,6 +593,7 @@ class Applying {
   std::optional<ResultIndex> m_ofNew;
   Failures& m_failures;
   std::set<const Decision*> m_stale;
+  std::map<std::size_t, std::vector<const Decision*>> m_unfit;  // stale, and that is allowed
   std::map<std::size_t, const Decision*> m_made;
 };
 

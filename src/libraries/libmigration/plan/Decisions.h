@@ -51,9 +51,9 @@ void readDecisions(const Source& source, std::vector<Decision>* decisions, Failu
 // matter.
 std::string fingerprintOf(const Verdict& difference);
 
-// Carries the decisions of the request out on the differences. Entries that match nothing (unless
-// that is allowed), are stale, contradict another or cannot be carried out are failures, and change
-// nothing.
+// Carries the decisions of the request out on the differences. Entries that match nothing or are
+// stale (unless that is allowed), contradict another or cannot be carried out are failures, and
+// change nothing.
 struct ThreeWayRequest;
 void applyDecisions(const ThreeWayRequest& request, std::vector<Verdict>* differences,
                     Failures* failures);

@@ -29,7 +29,7 @@ struct PlanRequest {
   std::string withdrawList;  // empty without one
   std::vector<std::string> decisions;
   Prefer prefer = Prefer::kNothing;
-  bool allowUnused = false;  // decisions that match nothing
+  bool allowUnused = false;  // decisions that match nothing, or are for other texts
   bool acceptBase = false;   // a BASE that equals OLD, or NEW
   bool isRepaired = false;   // what can be mended is mended, in memory
   ReadLimits limits;

@@ -3,10 +3,12 @@
 #include <algorithm>
 #include <map>
 #include <nlohmann/json.hpp>
+#include <unordered_set>
 
 #include "Content.h"
 #include "Digest.h"
 #include "PlanSuperiors.h"
+#include "Questions.h"
 #include "Settings.h"
 
 namespace migration {
@@ -79,6 +81,29 @@ const Entry* inResult(const MigrationPlan& plan, const Verdict& row) {
   return plan.result->byOid(row.kind(), oid);
 }
 
+// What a decisions file may say of an undecided definition, as a template of decisions asks it.
+Json questionOf(const Questionnaire& questionnaire, const Verdict& row) {
+  const Question question = questionnaire.about(row);
+  Json takes = Json::array();
+  for (const Choice& choice : question.choices) {
+    takes.push_back(wordOf(choice.take));
+  }
+  Json clauses = Json::array();
+  for (const ClauseChoices& choices : question.clauses) {
+    if (!choices.change->isDecided) {
+      Json words = Json::array();
+      for (const Take take : choices.takes) {
+        words.push_back(wordOf(take));
+      }
+      clauses.push_back({{"clause", nameOf(choices.change->aspect)}, {"take", words}});
+    }
+  }
+  return {{"by", questionnaire.decisionAbout(row).oid.empty() ? "name" : "oid"},
+          {"take", takes},
+          {"clauses", clauses},
+          {"move", question.mayMove}};
+}
+
 Json definitionOf(const MigrationPlan& plan, const Verdict& row) {
   Json clauses = Json::array();
   for (const ClauseChange& change : row.clauses) {
@@ -95,6 +120,7 @@ Json definitionOf(const MigrationPlan& plan, const Verdict& row) {
           {"reason", row.reason},
           {"notes", row.notes},
           {"decision", row.decision.empty() ? Json(nullptr) : Json(row.decision)},
+          {"question", nullptr},
           {"fingerprint", fingerprintOf(row)},
           {"text", row.isCarried() ? Json(textOf(*row.result)) : Json(nullptr)},
           {"clauses", clauses},
@@ -104,6 +130,22 @@ Json definitionOf(const MigrationPlan& plan, const Verdict& row) {
             {"old", placeOf(row.match.old)},
             {"new", placeOf(row.match.latest)},
             {"result", placeOf(inResult(plan, row))}}}};
+}
+
+// To those of the definitions that somebody has to decide.
+void addQuestions(const MigrationPlan& plan, const std::vector<const Verdict*>& shown,
+                  Json* definitions) {
+  if (plan.undecidedCount == 0) {
+    return;
+  }
+  const Questionnaire questionnaire(plan);
+  const std::unordered_set<const Verdict*> open(questionnaire.open().begin(),
+                                                questionnaire.open().end());
+  for (std::size_t at = 0; at < shown.size(); ++at) {
+    if (open.count(shown[at]) != 0) {
+      (*definitions)[at]["question"] = questionOf(questionnaire, *shown[at]);
+    }
+  }
 }
 
 Json superiorsOf(const MigrationPlan& plan, const std::vector<const Verdict*>& shown) {
@@ -212,6 +254,7 @@ std::string planDocument(const MigrationPlan& plan, const std::vector<const Verd
   for (const Verdict* const row : shown) {
     definitions.push_back(definitionOf(plan, *row));
   }
+  addQuestions(plan, shown, &definitions);
   const Json document = {
       {"version", kDocumentVersion},
       {"program", {{"name", "schema-migrate"}, {"version", origin.programVersion}}},

@@ -24,7 +24,7 @@ struct ThreeWayRequest {
   std::set<std::string> withdrawn;
   Prefer prefer = Prefer::kNothing;
   std::vector<Decision> decisions;
-  bool allowUnused = false;  // decisions that match nothing
+  bool allowUnused = false;  // decisions that match nothing, or are for other texts
 };
 
 struct ThreeWay {
