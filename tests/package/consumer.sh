@@ -130,7 +130,7 @@ mkdir -p "$WORK"
 cd "$WORK"
 "build_by_$way"
 library=
-[ "$linkage" = static ] || library=libschema.so.${VERSION%%.*}
+[ "$linkage" = static ] || library=libschema.so.2
 for program in "${programs[@]}"; do
   expect "library that $program loads" "$library" "$(needed_library "build/$program")"
   "check_$program"

@@ -4,7 +4,6 @@
 set -euo pipefail
 . "$(dirname "$0")/expect.sh"
 
-major=${VERSION%%.*}
 lib=$(dirname "$(find "$PREFIX" -name libschema.a)")
 libraries=$(cd "$lib" && ls -d libschema*)
 headers=$(cd "$PREFIX/include/libschema" && ls)
@@ -38,22 +37,22 @@ ldtr.h
 timestamp.h" "$headers"
 expect "libraries" "libschema-migration.a
 libschema-migration.so
-libschema-migration.so.$major
-libschema-migration.so.$VERSION
+libschema-migration.so.1
+libschema-migration.so.1.$VERSION
 libschema-platform.a
 libschema-platform.so
-libschema-platform.so.$major
-libschema-platform.so.$VERSION
+libschema-platform.so.1
+libschema-platform.so.1.$VERSION
 libschema.a
 libschema.so
-libschema.so.$major
+libschema.so.2
 libschema.so.$VERSION" "$libraries"
-expect "SONAME" "libschema.so.$major" "$(entries SONAME libschema.so)"
-expect "SONAME of the platform" "libschema-platform.so.$major" "$(entries SONAME libschema-platform.so)"
-expect "libraries behind libschema" "libschema-platform.so.$major" "$(entries NEEDED libschema.so)"
-expect "SONAME of libschema-migration" "libschema-migration.so.$major" \
+expect "SONAME" "libschema.so.2" "$(entries SONAME libschema.so)"
+expect "SONAME of the platform" "libschema-platform.so.1" "$(entries SONAME libschema-platform.so)"
+expect "libraries behind libschema" "libschema-platform.so.1" "$(entries NEEDED libschema.so)"
+expect "SONAME of libschema-migration" "libschema-migration.so.1" \
   "$(entries SONAME libschema-migration.so)"
-expect "libraries behind libschema-migration" "libschema.so.$major" \
+expect "libraries behind libschema-migration" "libschema.so.2" \
   "$(entries NEEDED libschema-migration.so)"
 expect "where libschema-migration looks for them" "\$ORIGIN" \
   "$(entries RUNPATH libschema-migration.so)"

@@ -12,10 +12,11 @@ fields=$(awk '/^[^ ]/ { field = $1 } field ~ /^Build-Depends/ { print $1, $2 }' 
 for package in "${packages_to_build[@]}"; do
   [ "$package" = g++ ] || grep -qE "^$package(,| |$)" <<<"$fields" || expect "build dependency" "$package" "none"
 done
-major=${VERSION%%.*}
-expect "packages" "libschema$major libschema-platform$major libschema-migration$major libschema-dev \
-schema-migrate libschema-doc" "$(sed -n 's/^Package: //p' debian/control | tr '\n' ' ' | sed 's/ $//')"
-for library in libschema libschema-platform libschema-migration; do
-  expect "symbols of $library" "$library.so.$major $library$major #MINVER#" \
-    "$(grep "^$library" "debian/$library$major.symbols")"
+expect "packages" "libschema2 libschema-platform1 libschema-migration1 libschema-dev schema-migrate \
+libschema-doc" "$(sed -n 's/^Package: //p' debian/control | tr '\n' ' ' | sed 's/ $//')"
+for library in 'libschema 2' 'libschema-platform 1' 'libschema-migration 1'; do
+  read -r name number <<<"$library"
+  expect "symbols of $name" "$name.so.$number $name$number #MINVER#" \
+    "$(grep "^$name" "debian/$name$number.symbols")"
+  expect "files of $name" "usr/lib/*/$name.so.*" "$(cat "debian/$name$number.install")"
 done
