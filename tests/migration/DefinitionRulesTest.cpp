@@ -31,6 +31,9 @@ const Row kRows[] = {
     {"D201ValueOfAFlag", "ORVAttributetypes=( 1.2 EQUALITY caseIgnoreMatch )\n",
      "1:34 error D201\n"},
     {"D201NameOfAnExtension", "ORVAttributetypes=( 1.2 NAME 'a' EQUALITY )\n", "1:25 error D201\n"},
+    // The OID, which it replaces, is no part of the value before it.
+    {"D201ClauseOfAnotherKindBehindAText", "ORVAttributetypes=( 1.2 SYNTAX 1.3{x} )\n",
+     "1:25 error D201\n1:32 error L104\n"},
     {"D201ApproxOfAnExtension", "ORVAttributetypes=( 1.2 EQUALITY APPROX )\n", ""},
     // D202
     {"D202Collective", "attributetypes=( 1.2 SUP a COLLECTIVE )\n", "1:28 error D202\n"},
@@ -77,6 +80,9 @@ const Row kRows[] = {
     {"D206NameTwice", "attributetypes=( 1.2 NAME ( 'a' 'a' ) SUP a )\n", "1:33 error D206\n"},
     {"D206NameInOtherLetterCase", "attributetypes=( 1.2 NAME ( 'a' 'A' ) SUP a )\n",
      "1:33 warning D206\n"},
+    {"D206QuotedAndBareName", "attributetypes=( 1.2 NAME ( 'cn' cn ) SUP a )\n",
+     "1:34 error D206\n1:34 warning D207\n"},
+    {"D206NameThatOnlyBeginsAlike", "attributetypes=( 1.2 NAME ( 'cn' 'cnx' 'c' ) SUP a )\n", ""},
     {"D206MembersAreNotConcerned",
      "objectclasses=( 1.2 MUST ( a $ a ) MAY ( a $ A ) STRUCTURAL )\n", ""},
     {"D206DatabaseNamesAreNotConcerned", "ORVAttributetypes=( 1.2 DBNAME ( 'a' 'a' ) )\n", ""},

@@ -100,6 +100,35 @@ TEST(Installation, TellsReferences) {
   EXPECT_EQ("dangling gone at 51 of object class k (1.9)\nSUP of attribute type b (1.2)\n", text);
 }
 
+// A definition whose names differ in letter case alone shares them with nobody.
+TEST(Installation, TellsWhatSharesANameOrAnOid) {
+  const Installation schema =
+      support::installationOf({{"V3.user.at",
+                                "attributetypes=( 1.1 NAME ( 'a' 'A' ) DESC 'd' )\n"
+                                "attributetypes=( 1.2 NAME ( 'b' 'x' ) DESC 'd' )\n"
+                                "attributetypes=( 1.3 NAME ( 'c' 'X' 'B' ) DESC 'd' )\n"
+                                "attributetypes=( 1.3 NAME 'B' DESC 'd' )\n"}},
+                              "", "old");
+  std::string text;
+  const auto add = [&](const std::vector<const Entry*>& group) {
+    for (const Entry* const entry : group) {
+      text += " " + placeOf(entry);
+    }
+    text += "\n";
+  };
+  schema.forEachSharedAlias(Kind::kAttributeType,
+                            [&](std::string_view name, const std::vector<const Entry*>& group) {
+                              text += std::string(name) + ":";
+                              add(group);
+                            });
+  schema.forEachSharedName(Kind::kAttributeType, add);
+  schema.forEachSharedOid(Kind::kAttributeType, add);
+  EXPECT_EQ(
+      "b: V3.user.at:2 V3.user.at:3 V3.user.at:4\nx: V3.user.at:2 V3.user.at:3\n"
+      " V3.user.at:2 V3.user.at:4\n V3.user.at:3 V3.user.at:4\n",
+      text);
+}
+
 class Directory : public testing::Test {
  protected:
   Directory() : m_path(testing::TempDir() + "model-XXXXXX") {

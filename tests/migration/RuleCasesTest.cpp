@@ -224,6 +224,13 @@ const RuleCase kReferences[] = {
        "attributetypes=( 1.1 NAME 'a' SUP b )\nattributetypes=( 1.2 NAME 'b' SUP a )\n"
        "attributetypes=( 1.3 NAME 'c' SUP d )\nattributetypes=( 1.4 NAME 'd' SUP c )\n"}},
      "R402 error V3.user.at:1:31\nR402 error V3.user.at:3:31\n"},
+    {"LoopThatAlsoLeadsToWhatIsNone",
+     {{"V3.user.oc",
+       "objectclasses=( 2.5.6.0 NAME 'top' ABSTRACT )\n"
+       "objectclasses=( 1.1 NAME 'a' SUP top STRUCTURAL )\n"
+       "objectclasses=( 1.2 NAME 'b' SUP ( a $ c ) STRUCTURAL )\n"
+       "objectclasses=( 1.3 NAME 'c' SUP b STRUCTURAL )\n"}},
+     "R402 error V3.user.oc:3:30\n"},
     {"TwoWaysToOneSuperior",
      {{"V3.user.oc",
        "objectclasses=( 2.5.6.0 NAME 'top' ABSTRACT )\n"

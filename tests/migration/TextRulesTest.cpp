@@ -113,6 +113,8 @@ const Row kRows[] = {
     {"L108ServerSchema", "# x\nattributetype ( 1.2\n\tNAME 'caf\xc3\xa9' )\n", "1:1 error L108\n"},
     {"L108Identifiers", "objectidentifier a 1.2\n", "1:1 error L108\n"},
     {"L108Xml", "<?xml version=\"1.0\"?>\n<a/>\n", "1:1 error L108\n"},
+    {"L108XmlOfTwoBytes", "<a", "1:1 error L108\n"},
+    {"L108OneByteIsNoXml", "<", "1:1 error L109\n"},
     {"L108Json", "{ \"a\": 1 }\n", "1:1 error L108\n"},
     {"L108Compressed", "\x1f\x8b\x08xyz", "1:1 error L108\n"},
     {"L108DefinitionsBehindForeignText", "dn: a\nattributetypes=( 1.2 SUP a )\n",
