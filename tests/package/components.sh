@@ -27,7 +27,10 @@ expect "runtime" "$(for name in libschema-migration libschema-platform; do
   printf '%s\n' "$lib/$name.so.1" "$lib/$name.so.1.$VERSION"
 done
 printf '%s\n' "$lib/libschema.so.2" "$lib/libschema.so.$VERSION")" "$(files runtime)"
-expect "tool but for manual pages" ./bin/schema-migrate "$(files tool | grep -v '^./share/man/')"
+expect "tool but for manual pages" "./bin/schema-migrate
+./share/bash-completion/completions/schema-migrate
+./share/fish/vendor_completions.d/schema-migrate.fish
+./share/zsh/site-functions/_schema-migrate" "$(files tool | grep -v '^./share/man/')"
 expect "development outside of its folders" "$(for name in libschema-migration libschema-platform libschema
 do
   printf '%s\n' "$lib/$name.a" "$lib/$name.so"

@@ -78,6 +78,11 @@ for package in libschema libschema-migration; do
     "$(PKG_CONFIG_PATH=$lib/pkgconfig "$PKG_CONFIG" --modversion "$package")"
 done
 expect "tool" "schema-migrate $VERSION" "$("$PREFIX/bin/schema-migrate" --version)"
+for shell in bash:share/bash-completion/completions/schema-migrate zsh:share/zsh/site-functions/_schema-migrate \
+  fish:share/fish/vendor_completions.d/schema-migrate.fish; do
+  expect "completion for ${shell%%:*}" "$("$PREFIX/bin/schema-migrate" completion "${shell%%:*}")" \
+    "$(cat "$PREFIX/${shell#*:}")"
+done
 for page in "$(dirname "$0")"/../../docs/man/*.scd; do
   page=$(basename "$page" .scd)
   [ -s "$PREFIX/share/man/man${page##*.}/$page" ] || expect "man page" "$page" "none"

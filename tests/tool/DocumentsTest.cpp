@@ -104,7 +104,7 @@ TEST(Manual, ExitCodesAreThoseThatAreSettled) {
   const std::pair<const char*, const char*> kCodes[] = {
       {"", "0 1 2 3 4 5 "},      {"check", "0 1 2 3 5 "},  {"show", "0 1 2 3 5 "},
       {"explain", "0 2 5 "},     {"diff", "0 1 2 3 4 5 "}, {"plan", "0 2 3 4 5 "},
-      {"migrate", "0 2 3 4 5 "},
+      {"migrate", "0 2 3 4 5 "}, {"completion", "0 2 5 "},
   };
   for (const auto& [command, codes] : kCodes) {
     EXPECT_EQ(codes, text(inHelp(command, "Exit codes:", "^  ([0-9]+)  "))) << command;

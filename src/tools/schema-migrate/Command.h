@@ -27,12 +27,17 @@ class Command {
   // The words of the command line, the program's name first, for a command that tells them.
   virtual void takeWords(const std::vector<std::string>& /*words*/) {}
 
+  // The program with all commands declared, for a command that tells of them; it is gone when the
+  // command runs.
+  virtual void takeProgram(CLI::App* /*program*/) {}
+
   // Returns the exit code, or throws a Failure.
   virtual int run(Console* console) = 0;
 };
 
 // Each of the commands.
 std::unique_ptr<Command> makeCheckCommand();
+std::unique_ptr<Command> makeCompletionCommand();
 std::unique_ptr<Command> makeDecideCommand();
 std::unique_ptr<Command> makeDiffCommand();
 std::unique_ptr<Command> makeExplainCommand();

@@ -55,6 +55,14 @@ std::string emptyOption(int argc, char** argv) {
   return "";
 }
 
+std::string joined(const std::vector<std::string>& words) {
+  std::string text;
+  for (const std::string& word : words) {
+    text += (text.empty() ? "" : " ") + word;
+  }
+  return text;
+}
+
 // Help of at most 80 columns.
 class HelpFormatter : public CLI::Formatter {
  public:
@@ -131,6 +139,7 @@ class Program {
       std::vector<std::string> words = {m_program.get_name()};
       words.insert(words.end(), argv + 1, argv + argc);
       command->takeWords(words);
+      command->takeProgram(&m_program);
       return command;
     } catch (const CLI::Success& printed) {
       *exitCode = m_program.exit(printed);
@@ -167,6 +176,7 @@ class Program {
 Commands allCommands() {
   Commands commands;
   commands.push_back(makeCheckCommand());
+  commands.push_back(makeCompletionCommand());
   commands.push_back(makeDecideCommand());
   commands.push_back(makeDiffCommand());
   commands.push_back(makeExplainCommand());
@@ -189,11 +199,11 @@ CLI::Option* addList(CLI::App* command, const std::string& name, std::vector<std
       ->allow_extra_args(false);
 }
 
-CLI::Validator notEmpty() {
+CLI::Validator notEmpty(const std::vector<std::string>& usual) {
   return {[](const std::string& value) {
             return value.empty() ? std::string("the name is empty") : std::string();
           },
-          ""};
+          "", joined(usual)};
 }
 
 CLI::Validator oneOf(std::initializer_list<const char*> words) {
@@ -211,5 +221,5 @@ CLI::Validator oneOf(std::initializer_list<const char*> words) {
             }
             return text;
           },
-          ""};
+          "", joined(allowed)};
 }

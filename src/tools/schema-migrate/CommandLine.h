@@ -25,10 +25,11 @@ Command* parseCommandLine(int argc, char** argv, const Commands& commands, int* 
 CLI::Option* addList(CLI::App* command, const std::string& name, std::vector<std::string>* values,
                      const std::string& type, const std::string& description);
 
-// Refuses what an unset variable of a shell leaves of an option.
-CLI::Validator notEmpty();
+// Refuses what an unset variable of a shell leaves of an option. The words are those that it mostly
+// is; they are its name, with a blank between them, and so are offered by a shell.
+CLI::Validator notEmpty(const std::vector<std::string>& usual = {});
 
-// Refuses any other word than these.
+// Refuses any other word than these, which are its name, too.
 CLI::Validator oneOf(std::initializer_list<const char*> words);
 
 #endif  // SCHEMA_MIGRATE_COMMAND_LINE_H

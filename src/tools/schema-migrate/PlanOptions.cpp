@@ -47,7 +47,7 @@ const CLI::Validator kSize(
       value = std::to_string(bytes);
       return std::string();
     },
-    "", "size");
+    "");
 
 }  // namespace
 

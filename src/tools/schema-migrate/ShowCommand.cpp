@@ -1,5 +1,7 @@
 // show: definitions of an installation, for a person to read.
 
+#include <libschema-migration/Installation.h>
+
 #include <CLI/CLI.hpp>
 
 #include "Command.h"
@@ -61,7 +63,7 @@ class ShowCommand : public Command {
         ->type_name("KIND");
     CLI::Option* const file =
         show->add_option("--file", m_options.file, "only definitions of this file, as V3.user.at")
-            ->check(notEmpty())
+            ->check(notEmpty({migration::kSchemaFiles.begin(), migration::kSchemaFiles.end()}))
             ->type_name("FILE");
     CLI::Option* const match =
         show->add_option("--match", m_options.pattern,
