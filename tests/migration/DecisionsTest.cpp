@@ -217,6 +217,17 @@ TEST(Decisions, WhatIsTaken) {
       {"Clauses", kConflict, about("object-class", "c", "clauses = { SUP = \"new\" }"),
        "object class c (2.1) -> merged by d.toml:1 ( 2.1 NAME ( 'c' ) SUP ( r ) ABSTRACT MAY ( x $ "
        "n $ s ) )\n"},
+      {"OneOfTheMatchingRulesForAll",
+       {at("1.1 NAME 'a' EQUALITY e SYNTAX 1.2"), at("1.1 NAME 'a' EQUALITY f SYNTAX 1.2"),
+        at("1.1 NAME 'a' EQUALITY e SYNTAX 1.3")},
+       about("attribute-type", "a", "clauses = { EQUALITY = \"new\" }"),
+       "attribute type a (1.1) -> new by d.toml:1\n"},
+      {"TheMatchingRulesByAnotherOfThem",
+       {at("1.1 NAME 'a' EQUALITY e SYNTAX 1.2"), at("1.1 NAME 'a' EQUALITY f SYNTAX 1.2"),
+        at("1.1 NAME 'a' EQUALITY e SYNTAX 1.3")},
+       about("attribute-type", "a", "clauses = { ORDERING = \"old\" }"),
+       "attribute type a (1.1) -> old by d.toml:1 ( 1.1 NAME ( 'a' ) EQUALITY f SYNTAX 1.2 USAGE "
+       "userApplications )\n"},
       {"ClausesByUnion", kConflict, about("object-class", "c", "clauses = { SUP = \"union\" }"),
        "object class c (2.1) -> merged by d.toml:1 ( 2.1 NAME ( 'c' ) SUP ( r $ q ) ABSTRACT MAY ( "
        "x $ n $ s ) )\n"},
@@ -259,6 +270,13 @@ TEST(Decisions, WhatCannotBeCarriedOut) {
        "of them\n"},
       {"NoSuchClause", kConflict, about("object-class", "c", "clauses = { SYNTAX = \"new\" }"),
        undecided + cannot + "SYNTAX is no clause of an object class\n"},
+      {"TwoOfTheMatchingRulesFromTwoSides",
+       {at("1.1 NAME 'a' EQUALITY e SYNTAX 1.2"), at("1.1 NAME 'a' EQUALITY f SYNTAX 1.2"),
+        at("1.1 NAME 'a' EQUALITY e SYNTAX 1.3")},
+       about("attribute-type", "a", "clauses = { EQUALITY = \"old\", SYNTAX = \"new\" }"),
+       "attribute type a (1.1) -> undecided\n" + cannotForType +
+           "EQUALITY, ORDERING, SUBSTR and SYNTAX go together, and are to be taken from two "
+           "sides\n"},
       {"NoUnionOfAKind", kinds, about("object-class", "c", "clauses = { KIND = \"union\" }"),
        undecided + cannot + "KIND is no list, and has no union\n"},
       {"NoUnionOfTheOneSuperiorOfAnAttributeType", superiors,
@@ -561,7 +579,7 @@ TEST(Decisions, WhatClausesDoNotNameIsDecidedByThePreference) {
   EXPECT_EQ(decided(inputs, toml),
             "attribute type a (1.1) -> undecided\n"
             "d.toml:1: the decision about attribute type a (1.1) cannot be carried out: it leaves "
-            "undecided: MATCHING\n");
+            "undecided: SYNTAX\n");
   EXPECT_EQ(decided(inputs, toml, false, migration::Prefer::kOld),
             "attribute type a (1.1) -> merged by d.toml:1 ( 1.1 NAME ( 'a' ) SUP r SYNTAX 1.3 "
             "USAGE u )\n");

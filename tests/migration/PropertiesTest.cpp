@@ -249,7 +249,11 @@ TEST(Properties, WhatTheReleaseLeftAloneStaysTheSites) {
                            row.outcome == Outcome::kSame;
       const bool isDoubled =
           row.isUndecided() && row.reason.find("too, and the library") != std::string::npos;
-      if (!isRemoved && !isOrphan && !isSites && !isDoubled && !row.isNewsOnly && !row.isTaken) {
+      // The site's reference to what stays as NEW calls it is NEW's.
+      const bool isFollowing = row.outcome == Outcome::kNew && !row.notes.empty() &&
+                               row.notes.back().find("the reference follows") != std::string::npos;
+      if (!isRemoved && !isOrphan && !isSites && !isDoubled && !isFollowing && !row.isNewsOnly &&
+          !row.isTaken) {
         return shown(row);
       }
     }

@@ -1,6 +1,7 @@
 // Three-way differences: one row for each combination, with the whole outcome as text.
 
 #include "ThreeWay.h"
+#include "ToldClauses.h"
 
 #include <gtest/gtest.h>
 
@@ -34,12 +35,9 @@ Installation inUserFile(const std::string& name, const std::string& text) {
   return installationOf(name, {{"V3.user.at", text}});
 }
 
-std::string clauseOf(const migration::ClauseChange& change) {
-  const auto shown = [&](const migration::Values& values) {
-    return "<" + migration::shownValue(change.aspect, values) + ">";
-  };
-  return std::string(migration::nameOf(change.aspect)) + shown(change.base) + shown(change.old) +
-         shown(change.latest) + "=" + (change.isDecided ? shown(change.result) : std::string("?"));
+std::string clauseOf(const migration::ToldClause& clause) {
+  return clause.name + "<" + clause.base + "><" + clause.old + "><" + clause.latest +
+         ">=" + (clause.isDecided ? "<" + clause.result + ">" : "?");
 }
 
 std::string outcomeOf(const Verdict& row) {
@@ -90,7 +88,9 @@ std::string clausesOf(const Inputs& inputs) {
   std::string text;
   for (const Verdict& row : result.differences) {
     for (const migration::ClauseChange& change : row.clauses) {
-      text += clauseOf(change) + " " + std::string(wordOf(change.risk)) + "\n";
+      for (const migration::ToldClause& clause : toldClauses(change)) {
+        text += clauseOf(clause) + " " + std::string(wordOf(clause.risk)) + "\n";
+      }
     }
   }
   return text;
@@ -538,8 +538,14 @@ TEST(ThreeWay, ClausesAreToldWithTheirRisk) {
        {at("1.1 NAME 'a' EQUALITY e SYNTAX 1.2{8} USAGE u"),
         at("1.1 NAME 'a' EQUALITY f SYNTAX 1.2{8} USAGE u"),
         at("1.1 NAME 'a' EQUALITY e SYNTAX 1.2{9} USAGE u")},
-       "MATCHING<EQUALITY e SYNTAX 1.2{8}><EQUALITY f SYNTAX 1.2{8}><EQUALITY e SYNTAX 1.2{9}>=? "
-       "data\n"},
+       "EQUALITY<e><f><e>=? data\n"
+       "SYNTAX<1.2{8}><1.2{8}><1.2{9}>=? data\n"},
+      {"WhatIsEqualAmongThemIsNotTold",
+       {at("1.1 NAME 'a' EQUALITY e ORDERING o SUBSTR s SYNTAX 1.2{8}"),
+        at("1.1 NAME 'a' EQUALITY e SUBSTR s SYNTAX 1.2{8}"),
+        at("1.1 NAME 'a' EQUALITY e ORDERING o SUBSTR S SYNTAX 1.2{8}")},
+       "ORDERING<o><><o>=? data\n"
+       "SUBSTR<s><s><S>=? cosmetic\n"},
       {"SingleValueAdded",
        {at("1.1 NAME 'a' USAGE u"), at("1.1 NAME 'a' USAGE u"),
         at("1.1 NAME 'a' SINGLE-VALUE USAGE u")},

@@ -284,6 +284,7 @@ TEST_F(Deciding, QuitKeepsWhatWasAnsweredAndTheNextRunAsksTheRest) {
             "\n"
             "1 answer written to d.toml.\n"
             "2 definitions are left undecided.\n"
+            "1 other reason stands against the migration; plan tells it.\n"
             "To go on:\n"
             "  schema-migrate decide --from old --to new --base base --decisions d.toml\n");
   EXPECT_EQ(run->exitCode(), 4);
@@ -456,9 +457,12 @@ TEST_F(Deciding, AClauseThatASideLacksIsToldSo) {
   EXPECT_NE(text.find("  SUP, to be decided [structure]\n"
                       "    old      b\n"
                       "    new      (none)\n"
-                      "  MATCHING, to be decided [data]\n"
+                      "  EQUALITY, to be decided [data]\n"
                       "    old      (none)\n"
-                      "    new      EQUALITY m SYNTAX 1.2{3}\n"),
+                      "    new      m\n"
+                      "  SYNTAX, to be decided [data]\n"
+                      "    old      (none)\n"
+                      "    new      1.2{3}\n"),
             std::string::npos)
       << text;
   run.type("q");

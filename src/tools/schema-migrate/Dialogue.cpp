@@ -1,5 +1,6 @@
 #include "Dialogue.h"
 
+#include <libschema-migration/ToldClauses.h>
 #include <libschema-migration/Utf8.h>
 
 #include <algorithm>
@@ -220,16 +221,15 @@ Dialogue::Next Dialogue::answer(const Question& question, const Answer& chosen, 
 Dialogue::Next Dialogue::askClauses(const Question& question, Decision* decision) {
   for (std::size_t at = 0; at < question.clauses.size();) {
     const migration::ClauseChoices& clause = question.clauses[at];
-    const std::string name(nameOf(clause.change->aspect));
+    const std::vector<migration::ToldClause> told = toldClauses(*clause.change);
     const std::vector<Answer> answers = answersAbout(clause);
     const bool mayStay = clause.change->isDecided;
-    m_console.print(
-        clausePage(*clause.change, question.difference->match.base != nullptr, style()) +
-        answerLines(answers, style()));
+    m_console.print(clausePage(clause, question.difference->match, style()) +
+                    answerLines(answers, style()));
     const Answer* answered = nullptr;
     while (answered == nullptr) {
       const std::optional<std::string> line =
-          lineAfter(name + (mayStay ? " (Enter for merged): " : ": "));
+          lineAfter(toldNames(*clause.change) + (mayStay ? " (Enter for merged): " : ": "));
       if (!line) {
         return Next::kEnd;
       }
@@ -245,7 +245,9 @@ Dialogue::Next Dialogue::askClauses(const Question& question, Decision* decision
     if (answered != nullptr && answered->letter == kQuit) {
       return Next::kEnd;
     }
-    decision->clauses.erase(name);
+    for (const migration::ToldClause& each : told) {
+      decision->clauses.erase(each.name);
+    }
     if (answered != nullptr && answered->letter == kBack) {
       if (at == 0) {
         return Next::kAskAgain;
@@ -254,7 +256,9 @@ Dialogue::Next Dialogue::askClauses(const Question& question, Decision* decision
       continue;
     }
     if (answered != nullptr) {
-      decision->clauses[name] = answered->take;
+      for (const migration::ToldClause& each : told) {
+        decision->clauses[each.name] = answered->take;
+      }
     }
     ++at;
   }

@@ -9,9 +9,7 @@ namespace {
 bool isQuoted(std::string_view clause) { return clause == "NAME" || clause == "ALIASES"; }
 
 // What stands between two members of a clause.
-std::string separatorOf(std::string_view clause) {
-  return isQuoted(clause) || clause == "MATCHING" ? " " : " $ ";
-}
+std::string separatorOf(std::string_view clause) { return isQuoted(clause) ? " " : " $ "; }
 
 // Of which kind the definitions are that a clause names; empty when it names none.
 std::string_view namedKind(std::string_view clause, std::string_view kind) {
@@ -46,8 +44,7 @@ void addPart(const char* section, const std::string& text, std::size_t definitio
 }  // namespace
 
 bool isList(std::string_view clause) {
-  return clause == "ALIASES" || clause == "SUP" || clause == "MUST" || clause == "MAY" ||
-         clause == "MATCHING";
+  return clause == "ALIASES" || clause == "SUP" || clause == "MUST" || clause == "MAY";
 }
 
 std::vector<std::string> membersOf(std::string_view clause, const std::string& value) {

@@ -15,7 +15,7 @@
 
 namespace html {
 
-// Clauses with several members, of MATCHING its words, and the members of the value of one.
+// Clauses with several members, and the members of the value of one.
 bool isList(std::string_view clause);
 std::vector<std::string> membersOf(std::string_view clause, const std::string& value);
 

@@ -2,6 +2,7 @@
 
 #include <libschema-migration/Content.h>
 #include <libschema-migration/Inheritance.h>
+#include <libschema-migration/ToldClauses.h>
 #include <libschema-migration/Verdict.h>
 
 #include <algorithm>
@@ -108,7 +109,9 @@ class TextWriter {
     addLine("", printable(row.reason));
     addPlaces(row);
     for (const ClauseChange& change : row.clauses) {
-      addClause(change);
+      for (const migration::ToldClause& clause : toldClauses(change)) {
+        addClause(clause);
+      }
     }
     for (const std::string& note : row.notes) {
       addLine("note", printable(note));
@@ -149,18 +152,18 @@ class TextWriter {
     addLine("", printable(places));
   }
 
-  void addClause(const ClauseChange& change) {
-    addLine(std::string(nameOf(change.aspect)), "");
-    const auto add = [&](const char* side, const migration::Values& values) {
-      if (!values.empty()) {
-        addLine(std::string("  ") + side, wholePrintable(shownValue(change.aspect, values)));
+  void addClause(const migration::ToldClause& clause) {
+    addLine(clause.name, "");
+    const auto add = [&](const char* side, const std::string& value) {
+      if (!value.empty()) {
+        addLine(std::string("  ") + side, wholePrintable(value));
       }
     };
-    add("base", change.base);
-    add("old", change.old);
-    add("new", change.latest);
-    if (change.isDecided) {
-      add("result", change.result);
+    add("base", clause.base);
+    add("old", clause.old);
+    add("new", clause.latest);
+    if (clause.isDecided) {
+      add("result", clause.result);
     } else {
       addLine("  result", "undecided");
     }

@@ -1,5 +1,7 @@
 #include "QuestionPage.h"
 
+#include <libschema-migration/ToldClauses.h>
+
 #include "DisplayText.h"
 #include "Messages.h"
 
@@ -10,6 +12,7 @@ using migration::Entry;
 using migration::MigrationPlan;
 using migration::Question;
 using migration::Take;
+using migration::ToldClause;
 using migration::Values;
 using migration::Verdict;
 
@@ -30,9 +33,8 @@ std::string paragraph(std::size_t indent, const std::string& text, const PageSty
   return wrapped(std::string(indent, ' '), text, style.width);
 }
 
-std::string shownClause(const ClauseChange& change, const Values& values) {
-  const std::string text = values.empty() ? "" : wholePrintable(shownValue(change.aspect, values));
-  return text.empty() ? kNothingThere : text;
+std::string shownClause(const std::string& value) {
+  return value.empty() ? kNothingThere : wholePrintable(value);
 }
 
 std::string textOf(const Entry& entry) {
@@ -86,27 +88,31 @@ std::string wholeSides(const migration::MatchRow& match, bool hasBase, const Pag
          side("new", match.latest);
 }
 
+std::string sideLines(const ToldClause& clause, const migration::MatchRow& match, bool hasBase,
+                      const PageStyle& style) {
+  std::string text;
+  const auto side = [&](const char* name, bool isThere, const std::string& value) {
+    text += isThere ? labelled(4, name, shownClause(value), style) : "";
+  };
+  side("base", hasBase && match.base != nullptr, clause.base);
+  side("old", match.old != nullptr, clause.old);
+  side("new", match.latest != nullptr, clause.latest);
+  side("merged", clause.isDecided && match.old != nullptr && match.latest != nullptr,
+       clause.result);
+  return text;
+}
+
 std::string clauseLines(const Verdict& row, bool hasBase, const PageStyle& style) {
   std::string text;
   for (const ClauseChange& change : row.clauses) {
-    text += paragraph(
-        2,
-        std::string(nameOf(change.aspect)) + (change.isDecided ? "" : ", to be decided") +
-            (change.risk == migration::Risk::kNone ? ""
-                                                   : " [" + std::string(wordOf(change.risk)) + "]"),
-        style);
-    const auto side = [&](const char* name, const Entry* entry, const Values& values) {
-      if (entry != nullptr) {
-        text += labelled(4, name, shownClause(change, values), style);
-      }
-    };
-    if (hasBase) {
-      side("base", row.match.base, change.base);
-    }
-    side("old", row.match.old, change.old);
-    side("new", row.match.latest, change.latest);
-    if (change.isDecided && row.match.old != nullptr && row.match.latest != nullptr) {
-      text += labelled(4, "merged", shownClause(change, change.result), style);
+    for (const ToldClause& clause : toldClauses(change)) {
+      text += paragraph(2,
+                        clause.name + (clause.isDecided ? "" : ", to be decided") +
+                            (clause.risk == migration::Risk::kNone
+                                 ? ""
+                                 : " [" + std::string(wordOf(clause.risk)) + "]"),
+                        style) +
+              sideLines(clause, row.match, hasBase, style);
     }
   }
   return text;
@@ -225,15 +231,16 @@ std::string questionPage(const std::string& title, const Question& question,
          (depending.empty() ? paragraph(2, "Nothing refers to it.", style) : depending) + "\n";
 }
 
-std::string clausePage(const ClauseChange& change, bool hasBase, const PageStyle& style) {
-  std::string text = "\n" + paragraph(2, std::string(nameOf(change.aspect)), style);
-  if (hasBase) {
-    text += labelled(4, "base", shownClause(change, change.base), style);
+std::string clausePage(const migration::ClauseChoices& choices, const migration::MatchRow& match,
+                       const PageStyle& style) {
+  const std::vector<ToldClause> clauses = toldClauses(*choices.change);
+  std::string text = "\n";
+  for (const ToldClause& clause : clauses) {
+    text +=
+        paragraph(2, clause.name, style) + sideLines(clause, match, match.base != nullptr, style);
   }
-  text += labelled(4, "old", shownClause(change, change.old), style);
-  text += labelled(4, "new", shownClause(change, change.latest), style);
-  if (change.isDecided) {
-    text += labelled(4, "merged", shownClause(change, change.result), style);
+  if (clauses.size() > 1) {
+    text += paragraph(2, "The matching rules and SYNTAX are decided together.", style);
   }
   return text + "\n";
 }
@@ -297,10 +304,10 @@ std::string explanation(const Question& question, const std::string& file, const
 std::string clauseExplanation(const migration::ClauseChoices& clause, const PageStyle& style) {
   const ClauseChange& change = *clause.change;
   std::string text =
-      "\n" +
-      paragraph(0, "What each choice makes of " + std::string(nameOf(change.aspect)) + ":", style);
+      "\n" + paragraph(0, "What each choice makes of " + toldNames(change) + ":", style);
   const auto add = [&](const std::string& letter, const Values& values) {
-    text += labelled(2, letter, shownClause(change, values), style);
+    const std::string value = shownValue(change.aspect, values);
+    text += labelled(2, letter, shownClause(value), style);
   };
   for (const Answer& answer : answersAbout(clause)) {
     switch (answer.take) {

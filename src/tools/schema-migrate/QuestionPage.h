@@ -43,7 +43,8 @@ std::string lettersOf(const std::vector<Answer>& answers);
 // The difference and what depends on it, below a title; a clause by itself.
 std::string questionPage(const std::string& title, const migration::Question& question,
                          const migration::MigrationPlan& plan, const PageStyle& style);
-std::string clausePage(const migration::ClauseChange& change, bool hasBase, const PageStyle& style);
+std::string clausePage(const migration::ClauseChoices& choices, const migration::MatchRow& match,
+                       const PageStyle& style);
 
 // The answers, a line each.
 std::string answerLines(const std::vector<Answer>& answers, const PageStyle& style);

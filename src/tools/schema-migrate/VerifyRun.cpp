@@ -110,16 +110,16 @@ std::string line(const std::string& file, std::uint64_t number, const std::strin
          "\n";
 }
 
-std::string shown(migration::Aspect aspect, const migration::Values& values) {
-  return values.empty() ? "(none)" : wholePrintable(shownValue(aspect, values));
+std::string shown(const std::string& value) {
+  return value.empty() ? "(none)" : wholePrintable(value);
 }
 
 std::string rendered(const OutputDifference& difference) {
   std::string text = line(difference.file, difference.line, difference.text);
   for (const migration::ClauseDifference& clause : difference.clauses) {
-    text += "  " + std::string(nameOf(clause.aspect)) + "\n";
-    text += "    planned " + shown(clause.aspect, clause.planned) + "\n";
-    text += "    found   " + shown(clause.aspect, clause.found) + "\n";
+    text += "  " + clause.name + "\n";
+    text += "    planned " + shown(clause.planned) + "\n";
+    text += "    found   " + shown(clause.found) + "\n";
   }
   return text;
 }

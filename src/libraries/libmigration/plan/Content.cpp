@@ -16,9 +16,6 @@ constexpr std::array<std::string_view, kAspectCount> kNames = {
     "ACCESS-CLASS", "LENGTH",   "EQUALITY",     "ORDERING",   "SUBSTR",
     "APPROX",       "REVERSE"};
 
-constexpr std::array<std::string_view, 4> kMatchingKeywords = {"EQUALITY", "ORDERING", "SUBSTR",
-                                                               "SYNTAX"};
-
 void setFlag(Content* fields, Aspect aspect, bool isSet) {
   if (isSet) {
     (*fields)[aspect] = {std::string(nameOf(aspect))};
@@ -145,7 +142,7 @@ void addFlags(const Content& fields, std::initializer_list<Aspect> aspects, std:
 void addMatching(const Values& values, std::string* text) {
   for (std::size_t i = 0; i < values.size(); ++i) {
     if (!values[i].empty()) {
-      text->append(kMatchingKeywords[i]).append(" ").append(values[i]).append(" ");
+      text->append(kMatchingNames[i]).append(" ").append(values[i]).append(" ");
     }
   }
 }

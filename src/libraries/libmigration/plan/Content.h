@@ -49,8 +49,10 @@ constexpr std::size_t kAspectCount = 22;
 using Values = std::vector<std::string>;
 
 // "SYNTAX", "NAME" for the first name, "ALIASES", "KIND" of a class, "EQUALITY" for the flag, too.
-// Of kMatching "MATCHING".
+// Of kMatching, whose members are told by kMatchingNames, "MATCHING".
 std::string_view nameOf(Aspect aspect);
+constexpr std::array<std::string_view, 4> kMatchingNames = {"EQUALITY", "ORDERING", "SUBSTR",
+                                                            "SYNTAX"};
 
 // The aspects that definitions of a kind have, in the order in which they are told.
 const std::vector<Aspect>& aspectsOf(Kind kind);

@@ -19,6 +19,7 @@
 #include "RuleSupport.h"
 #include "Source.h"
 #include "ThreeWay.h"
+#include "ToldClauses.h"
 
 namespace migration {
 
@@ -146,14 +147,15 @@ std::string readText(Kind kind, const std::string& text, Content* content) {
 // The clause that a word means; EQUALITY, ORDERING, SUBSTR and SYNTAX of an attribute type are one.
 std::optional<Aspect> aspectOf(Kind kind, const std::string& word) {
   for (const Aspect aspect : aspectsOf(kind)) {
-    if (nameOf(aspect) == word) {
+    const bool isIts =
+        aspect == Aspect::kMatching
+            ? std::find(kMatchingNames.begin(), kMatchingNames.end(), word) != kMatchingNames.end()
+            : nameOf(aspect) == word;
+    if (isIts) {
       return aspect;
     }
   }
-  const bool isMatching =
-      word == "SYNTAX" || word == "EQUALITY" || word == "ORDERING" || word == "SUBSTR";
-  return kind == Kind::kAttributeType && isMatching ? std::optional<Aspect>(Aspect::kMatching)
-                                                    : std::nullopt;
+  return std::nullopt;
 }
 
 // Carries one decision out on its row. Every function returns what is wrong, or "".
@@ -203,6 +205,9 @@ class Carrying {
     if (m_row.kind() != Kind::kVendorExtension && !isConfigFile(*latest->file)) {
       return "NEW has another definition under its OID too, and the library finds only that one: "
              "only \"new\" can be taken";
+    }
+    if (latest == nullptr) {
+      return std::string(kNothingBesideItsType) + ": only \"new\" can be taken";
     }
     return std::string("NEW has ") +
            (latest != nullptr && isConfigFile(*latest->file) ? "it" : "its attribute type") +
@@ -262,7 +267,7 @@ class Carrying {
   std::string takeMerged() {
     for (const ClauseChange& change : m_row.clauses) {
       if (change.isInConflict && !change.isDecided && !isList(m_row.kind(), change.aspect)) {
-        return "it cannot be merged: " + std::string(nameOf(change.aspect)) +
+        return "it cannot be merged: " + toldNames(change) +
                " was changed in two ways; decide it by \"clauses\"";
       }
     }
@@ -290,9 +295,8 @@ class Carrying {
       }
       const auto [place, isNew] = takes.emplace(static_cast<int>(*aspect), take);
       if (!isNew && place->second != take) {
-        return word +
-               " goes together with the other matching rules and SYNTAX, which are taken "
-               "from another side";
+        return "EQUALITY, ORDERING, SUBSTR and SYNTAX go together, and are to be taken from two "
+               "sides";
       }
     }
     return merge([&](const ClauseChange& change) -> std::optional<Values> {
@@ -333,7 +337,7 @@ class Carrying {
         change.isDecided = true;
       }
       if (!change.isDecided) {
-        open.append(open.empty() ? "" : ", ").append(nameOf(change.aspect));
+        open.append(open.empty() ? "" : ", ").append(toldNames(change));
       }
     }
     if (!open.empty()) {

@@ -1,6 +1,7 @@
 #include "DecisionsTemplate.h"
 
 #include "Questions.h"
+#include "ToldClauses.h"
 
 namespace migration {
 
@@ -26,9 +27,11 @@ std::string choicesOf(const Question& question) {
 std::string clausesOf(const Question& question) {
   std::string clauses;
   for (const ClauseChoices& choices : question.clauses) {
-    if (!choices.change->isDecided) {
-      clauses.append(clauses.empty() ? "" : ", ").append(nameOf(choices.change->aspect));
-      clauses += " = \"\"";
+    if (choices.change->isDecided) {
+      continue;
+    }
+    for (const ToldClause& clause : toldClauses(*choices.change)) {
+      clauses.append(clauses.empty() ? "" : ", ").append(clause.name).append(" = \"\"");
     }
   }
   return clauses;

@@ -80,18 +80,26 @@ class NewsOwn {
                  row);
   }
 
-  // Nor can a vendor extension be written beside an attribute type that stands only there.
+  // Nor can a vendor extension be written beside an attribute type that stands only there, or be
+  // added to V3.modifiedschema.
   void keepConfigFileOfType(Verdict* row) {
     if (row->kind() != Kind::kVendorExtension || row->match.attribute == kNoRow) {
       return;
     }
     const Entry* const type = m_rows[row->match.attribute].match.latest;
-    if (type == nullptr || !isConfigFile(*type->file) || row->isNewsOnly) {
+    if (type == nullptr || row->isNewsOnly) {
+      return;
+    }
+    const bool isAddition = row->match.latest == nullptr && isModifiedSchema(*type->file);
+    if (!isConfigFile(*type->file) && !isAddition) {
       return;
     }
     row->isNewsOnly = true;
     if (row->isCarried() || row->isUndecided()) {
-      makeNewsOnly("NEW has its attribute type only in " + carriedOver(*type), row);
+      makeNewsOnly(row->match.latest == nullptr
+                       ? kNothingBesideItsType
+                       : "NEW has its attribute type only in " + carriedOver(*type),
+                   row);
     }
   }
 

@@ -9,6 +9,7 @@
 
 #include "Check.h"
 #include "ResultIndex.h"
+#include "ToldClauses.h"
 
 namespace migration {
 
@@ -139,7 +140,13 @@ class DefinitionComparison {
     std::vector<ClauseDifference> clauses;
     for (const Aspect aspect : aspectsOf(planned.kind())) {
       if (wanted[aspect] != there[aspect]) {
-        clauses.push_back({aspect, wanted[aspect], there[aspect]});
+        ClauseChange change;
+        change.aspect = aspect;
+        change.old = wanted[aspect];
+        change.latest = there[aspect];
+        for (const ToldClause& clause : toldClauses(change)) {
+          clauses.push_back({clause.name, clause.old, clause.latest});
+        }
       }
     }
     tell(found, describe(planned) + " is not what was planned" + reasonOf(idOf(planned)),

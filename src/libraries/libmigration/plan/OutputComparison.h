@@ -24,9 +24,9 @@ struct PlannedFiles {
 
 // A clause that is not as planned.
 struct ClauseDifference {
-  Aspect aspect = Aspect::kOid;
-  Values planned;  // empty without the clause
-  Values found;
+  std::string name;
+  std::string planned;  // as they are shown; empty without the clause
+  std::string found;
 };
 
 // A definition that is missing, additional, changed or in the wrong file; or a file.

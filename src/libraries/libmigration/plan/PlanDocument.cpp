@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <map>
 #include <nlohmann/json.hpp>
+#include <set>
 #include <unordered_set>
 
 #include "Content.h"
@@ -10,6 +11,7 @@
 #include "PlanSuperiors.h"
 #include "Questions.h"
 #include "Settings.h"
+#include "ToldClauses.h"
 
 namespace migration {
 
@@ -28,35 +30,40 @@ Json placeOf(const Entry* entry) {
   return {{"file", entry->file->source->path()}, {"line", entry->place().line}};
 }
 
-Json valueOf(Aspect aspect, const Values& values) {
-  if (values.empty()) {
-    return nullptr;
-  }
-  return shownValue(aspect, values);
-}
+Json textOrNull(const std::string& text) { return text.empty() ? Json(nullptr) : Json(text); }
 
-Json clauseOf(const ClauseChange& change) {
-  return {{"clause", nameOf(change.aspect)},
-          {"base", valueOf(change.aspect, change.base)},
-          {"old", valueOf(change.aspect, change.old)},
-          {"new", valueOf(change.aspect, change.latest)},
-          {"result", change.isDecided ? valueOf(change.aspect, change.result) : Json(nullptr)},
-          {"decided", change.isDecided},
-          {"risk", wordOf(change.risk)}};
+Json clausesOf(const Verdict& row) {
+  Json clauses = Json::array();
+  for (const ClauseChange& change : row.clauses) {
+    for (const ToldClause& clause : toldClauses(change)) {
+      clauses.push_back({{"clause", clause.name},
+                         {"base", textOrNull(clause.base)},
+                         {"old", textOrNull(clause.old)},
+                         {"new", textOrNull(clause.latest)},
+                         {"result", textOrNull(clause.result)},
+                         {"decided", clause.isDecided},
+                         {"risk", wordOf(clause.risk)}});
+    }
+  }
+  return clauses;
 }
 
 // What it says beside the clauses that differ, so that a reader has the whole of it.
 Json otherClausesOf(const Verdict& row) {
   const Entry& entry = row.match.latest != nullptr ? *row.match.latest : row.entry();
   const Content content = contentOf(*entry.kept);
+  std::set<std::string> told;
+  for (const ClauseChange& change : row.clauses) {
+    for (const ToldClause& clause : toldClauses(change)) {
+      told.insert(clause.name);
+    }
+  }
   Json clauses = Json::array();
   for (const Aspect aspect : aspectsOf(row.kind())) {
-    const bool isTold =
-        std::any_of(row.clauses.begin(), row.clauses.end(),
-                    [&](const ClauseChange& change) { return change.aspect == aspect; });
-    if (!isTold && !shownValue(aspect, content[aspect]).empty()) {
-      clauses.push_back(
-          {{"clause", nameOf(aspect)}, {"value", shownValue(aspect, content[aspect])}});
+    for (const ToldValue& clause : toldValues(aspect, content[aspect])) {
+      if (told.count(clause.name) == 0) {
+        clauses.push_back({{"clause", clause.name}, {"value", clause.value}});
+      }
     }
   }
   return clauses;
@@ -95,7 +102,9 @@ Json questionOf(const Questionnaire& questionnaire, const Verdict& row) {
       for (const Take take : choices.takes) {
         words.push_back(wordOf(take));
       }
-      clauses.push_back({{"clause", nameOf(choices.change->aspect)}, {"take", words}});
+      for (const ToldClause& clause : toldClauses(*choices.change)) {
+        clauses.push_back({{"clause", clause.name}, {"take", words}});
+      }
     }
   }
   return {{"by", questionnaire.decisionAbout(row).oid.empty() ? "name" : "oid"},
@@ -105,10 +114,6 @@ Json questionOf(const Questionnaire& questionnaire, const Verdict& row) {
 }
 
 Json definitionOf(const MigrationPlan& plan, const Verdict& row) {
-  Json clauses = Json::array();
-  for (const ClauseChange& change : row.clauses) {
-    clauses.push_back(clauseOf(change));
-  }
   return {{"kind", wordOf(row.kind())},
           {"oid", row.entry().kept->object->oidInPlace()},
           {"name", nameOfDefinition(row, plan.threeWay.differences)},
@@ -123,7 +128,7 @@ Json definitionOf(const MigrationPlan& plan, const Verdict& row) {
           {"question", nullptr},
           {"fingerprint", fingerprintOf(row)},
           {"text", row.isCarried() ? Json(textOf(*row.result)) : Json(nullptr)},
-          {"clauses", clauses},
+          {"clauses", clausesOf(row)},
           {"otherClauses", otherClausesOf(row)},
           {"places",
            {{"base", placeOf(row.match.base)},
@@ -199,8 +204,6 @@ Json countsOf(const MigrationPlan& plan) {
           {"outcome", outcomes},
           {"risk", risks}};
 }
-
-Json textOrNull(const std::string& text) { return text.empty() ? Json(nullptr) : Json(text); }
 
 Json optionsOf(const PlanRequest& asked) {
   const Json prefer = asked.prefer == Prefer::kOld   ? Json("old")

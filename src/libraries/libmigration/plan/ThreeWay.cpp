@@ -1,5 +1,6 @@
 #include "ThreeWay.h"
 #include "RuleSupport.h"
+#include "ToldClauses.h"
 
 #include <algorithm>
 #include <string_view>
@@ -77,7 +78,7 @@ std::string clausesInConflict(const Verdict& row) {
   std::string text;
   for (const ClauseChange& change : row.clauses) {
     if (!change.isDecided) {
-      text.append(text.empty() ? "" : ", ").append(nameOf(change.aspect));
+      text.append(text.empty() ? "" : ", ").append(toldNames(change));
     }
   }
   return text;

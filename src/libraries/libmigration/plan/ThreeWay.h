@@ -63,6 +63,10 @@ void keepNewsOwn(const Installation& latest, const std::vector<const Entry*>& un
                  std::vector<Verdict>* differences);
 bool hasOtherIdentity(const Content& content, const Entry& latest);
 std::string whyIdentityStays(const Verdict& difference);
+// Why a vendor extension that NEW lacks cannot be carried.
+constexpr const char* kNothingBesideItsType =
+    "NEW has its attribute type in a config file or in V3.modifiedschema, to which the library adds "
+    "nothing";
 
 // What OLD brings with an OID, a name or a DBNAME that NEW gives to another definition, which keeps
 // it in the result, is taken.

@@ -55,6 +55,12 @@ void follow(const ThreeWayRequest& request, const Verdict& type, Verdict* extens
     return;
   }
   extension->outcome = type.outcome;
+  if (type.isCarried() && extension->isNewsOnly) {
+    extension->outcome = Outcome::kUndecided;
+    extension->reason = kNothingBesideItsType;
+    extension->decision.clear();
+    return;
+  }
   if (type.isCarried()) {
     extension->result = contentOf(*match.old->kept);
     (*extension->result)[Aspect::kOid] = {type.result->oid()};
