@@ -31,6 +31,9 @@ expect "tool but for manual pages" "./bin/schema-migrate
 ./share/bash-completion/completions/schema-migrate
 ./share/fish/vendor_completions.d/schema-migrate.fish
 ./share/zsh/site-functions/_schema-migrate" "$(files tool | grep -v '^./share/man/')"
+expect "manual pages of the tool" "" "$(files tool | grep '^./share/man/' | grep -vE '/man[15]/schema-migrate' || true)"
+expect "manual pages for programs" "./share/man/man3/libschema-migration.3
+./share/man/man3/libschema.3" "$(files development | grep '^./share/man/')"
 expect "development outside of its folders" "$(for name in libschema-migration libschema-platform libschema
 do
   printf '%s\n' "$lib/$name.a" "$lib/$name.so"
