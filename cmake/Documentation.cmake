@@ -4,7 +4,7 @@
 option(LIBSCHEMA_REFERENCE "Make the reference of both libraries (Doxygen)" OFF)
 
 install(FILES README.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
-install(DIRECTORY docs/ DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation
+install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation
         FILES_MATCHING PATTERN "*.md" PATTERN "*.schema.json" PATTERN "reference" EXCLUDE PATTERN "man" EXCLUDE)
 install(DIRECTORY examples DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
 

@@ -7,7 +7,7 @@
     nlohmann-json3-dev pkg-config scdoc)
   packages_to_test=(abigail-tools binutils libgtest-dev libldap-dev python3-jsonschema valgrind man-db
     devscripts doxygen chromium chromium-driver poppler-utils python3-selenium
-    bash-completion fish zsh)
+    bash-completion fish pre-commit zsh)
   packages_to_package=(debhelper dpkg-dev devscripts doxygen fakeroot lintian locales xz-utils)
   packages_to_compare=(abigail-tools binutils xz-utils)
   packages_to_check=(clang clang-tidy clang-format libbenchmark-dev)
