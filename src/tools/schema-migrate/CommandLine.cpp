@@ -25,11 +25,12 @@ Example:
 
 Exit codes:
   0  done
-  1  check has findings, diff or verify shows differences, or show does not know a
+  1  check has findings, diff or verify shows differences, or show finds no such
      name
   2  the command line is wrong
   3  an input is missing, unreadable, too large or cannot be parsed
-  4  refused: a definition cannot be migrated, or is undecided; nothing was written
+  4  refused: a definition cannot be migrated, or is undecided; nothing was
+     written
   5  writing or verification failed
 
 Manual: man schema-migrate)";

@@ -6,7 +6,7 @@
 void HtmlOption::declare(CLI::App* command) {
   command
       ->add_option("--html", m_path,
-                   "write the report as a page for a browser, too; FILE may be one of before")
+                   "write the report as a page for a browser, too; an earlier page is replaced")
       ->check(notEmpty())
       ->type_name("FILE");
 }
