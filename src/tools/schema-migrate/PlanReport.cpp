@@ -96,14 +96,15 @@ constexpr char kPlain[] = "\033[0m";
 
 class TextWriter {
  public:
-  explicit TextWriter(const PlanStyle& style) : m_style(style) {}
+  TextWriter(const MigrationPlan& plan, const PlanStyle& style) : m_plan(plan), m_style(style) {}
 
   void addDifference(const Verdict& row) {
     const bool isUrgent = row.isUndecided();
-    m_text += coloured(isUrgent ? kRed : kBold, printable(describe(row))) + ": " +
-              nameOf(row.change) + (row.isRenamed ? ", renamed" : "") +
-              (row.isRenumbered ? ", renumbered" : "") + " -> " +
-              coloured(isUrgent ? kRed : kBold, std::string(wordOf(row.outcome)));
+    m_text +=
+        coloured(isUrgent ? kRed : kBold, printable(describe(row, m_plan.threeWay.differences))) +
+        ": " + nameOf(row.change) + (row.isRenamed ? ", renamed" : "") +
+        (row.isRenumbered ? ", renumbered" : "") + " -> " +
+        coloured(isUrgent ? kRed : kBold, std::string(wordOf(row.outcome)));
     m_text +=
         row.risk == migration::Risk::kNone ? "\n" : " [" + std::string(wordOf(row.risk)) + "]\n";
     addLine("", printable(row.reason));
@@ -169,6 +170,7 @@ class TextWriter {
     }
   }
 
+  const MigrationPlan& m_plan;
   const PlanStyle& m_style;
   std::string m_text;
 };
@@ -249,7 +251,7 @@ std::string renderUnknownNames(const MigrationPlan& plan, const std::vector<std:
 
 std::string renderDifferences(const MigrationPlan& plan, const ShownDifferences& shown,
                               const PlanStyle& style) {
-  TextWriter writer(style);
+  TextWriter writer(plan, style);
   if (!style.isSummaryOnly) {
     for (const Verdict* const row : shown) {
       writer.addDifference(*row);
@@ -313,7 +315,8 @@ std::string whyNotReady(const MigrationPlan& plan) {
   }
   for (const Verdict& row : plan.threeWay.differences) {
     if (row.isUndecided()) {
-      lines += errorLine("undecided: " + printable(describe(row)) + ": " + printable(row.reason));
+      lines += errorLine("undecided: " + printable(describe(row, plan.threeWay.differences)) +
+                         ": " + printable(row.reason));
     }
   }
   return lines;
@@ -323,7 +326,7 @@ std::string renderReadiness(const MigrationPlan& plan, const PlanStyle& style) {
   if (plan.isReady()) {
     return "Ready: every definition is decided.\n";
   }
-  const TextWriter writer(style);
+  const TextWriter writer(plan, style);
   return writer.coloured(kRed, "Not ready: " + counted(plan.undecidedCount, "definition") +
                                    " undecided, " + counted(plan.refusals.size(), "other reason") +
                                    ".") +

@@ -49,7 +49,8 @@ std::string entryOf(const Questionnaire& questionnaire, const Verdict& row,
                     const MigrationPlan& plan) {
   const Question question = questionnaire.about(row);
   const Decision decision = questionnaire.decisionAbout(row);
-  std::string text = "\n[[definition]]\n" + tomlComment(describe(row) + ": " + row.reason);
+  std::string text = "\n[[definition]]\n" +
+                     tomlComment(describe(row, plan.threeWay.differences) + ": " + row.reason);
   text += (plan.base ? sideOf("BASE", row.match.base) : std::string()) +
           sideOf("OLD ", row.match.old) + sideOf("NEW ", row.match.latest);
   const std::string dependents = dependentsOf(referrersInOld(row, plan));

@@ -69,16 +69,6 @@ Json otherClausesOf(const Verdict& row) {
   return clauses;
 }
 
-std::string nameOfDefinition(const Verdict& row, const std::vector<Verdict>& rows) {
-  const bool isExtension = row.kind() == Kind::kVendorExtension;
-  if (isExtension && row.match.attribute == kNoRow) {
-    return "";
-  }
-  const Entry& named = isExtension ? rows[row.match.attribute].entry() : row.entry();
-  const Values& names = named.kept->object->namesInPlace();
-  return names.empty() ? std::string() : names.front();
-}
-
 const Entry* inResult(const MigrationPlan& plan, const Verdict& row) {
   if (!row.isInResult() || !plan.result) {
     return nullptr;
@@ -116,7 +106,7 @@ Json questionOf(const Questionnaire& questionnaire, const Verdict& row) {
 Json definitionOf(const MigrationPlan& plan, const Verdict& row) {
   return {{"kind", wordOf(row.kind())},
           {"oid", row.entry().kept->object->oidInPlace()},
-          {"name", nameOfDefinition(row, plan.threeWay.differences)},
+          {"name", firstNameOf(row, plan.threeWay.differences)},
           {"class", wordOf(row.change)},
           {"renamed", row.isRenamed},
           {"renumbered", row.isRenumbered},
@@ -158,7 +148,7 @@ Json superiorsOf(const MigrationPlan& plan, const std::vector<const Verdict*>& s
   for (const SuperiorNode& node : superiorsAround(plan, shown)) {
     array.push_back({{"kind", wordOf(node.row->kind())},
                      {"oid", node.row->entry().kept->object->oidInPlace()},
-                     {"name", nameOfDefinition(*node.row, plan.threeWay.differences)},
+                     {"name", firstNameOf(*node.row, plan.threeWay.differences)},
                      {"superiors", *node.superiors}});
   }
   return array;

@@ -46,4 +46,24 @@ Content baseContentOf(const Verdict& difference) {
 
 std::string describe(const Verdict& difference) { return describe(*difference.entry().kept); }
 
+std::string firstNameOf(const Verdict& difference, const std::vector<Verdict>& differences) {
+  const bool isExtension = difference.kind() == Kind::kVendorExtension;
+  if (isExtension && difference.match.attribute == kNoRow) {
+    return "";
+  }
+  const Entry& named =
+      isExtension ? differences[difference.match.attribute].entry() : difference.entry();
+  const Values& names = named.kept->object->namesInPlace();
+  return names.empty() ? std::string() : names.front();
+}
+
+std::string describe(const Verdict& difference, const std::vector<Verdict>& differences) {
+  const std::string name = firstNameOf(difference, differences);
+  if (difference.kind() != Kind::kVendorExtension || name.empty()) {
+    return describe(difference);
+  }
+  return std::string(nameOf(difference.kind())) + " of " + name + " (" +
+         difference.entry().kept->object->oidInPlace() + ")";
+}
+
 }  // namespace migration

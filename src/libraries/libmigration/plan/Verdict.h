@@ -104,6 +104,12 @@ Content baseContentOf(const Verdict& difference);
 
 // "attribute type cn (2.5.4.3)", by its first name and OID as entry() has them.
 std::string describe(const Verdict& difference);
+// Its first name; of a vendor extension that of its attribute type among `differences`, all those
+// of one plan. Empty where there is none.
+std::string firstNameOf(const Verdict& difference, const std::vector<Verdict>& differences);
+// As above, and a vendor extension by the name of its attribute type among `differences`: "vendor
+// extension of cn (2.5.4.3)".
+std::string describe(const Verdict& difference, const std::vector<Verdict>& differences);
 
 }  // namespace migration
 
