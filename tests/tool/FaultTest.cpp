@@ -243,7 +243,7 @@ class SideBySide : public testing::Test {
 
   // Eight different installations; two of them are refused.
   SideBySide() {
-    folder.install("new", {{"V3.system.at", "attributetypes=( 1.2 NAME 's' OBSOLETE )\n"}});
+    folder.install("new", {{"V3.system.at", "attributetypes=( 1.2 NAME 's' DESC 'shipped' )\n"}});
     for (int run = 0; run < kRuns; ++run) {
       std::string types = run == 2   ? "attributetypes=( 1.1\n"
                           : run == 5 ? "attributetypes=( 1.2 NAME 'other' OBSOLETE )\n"

@@ -61,9 +61,8 @@ std::string clauseInText(const Json& clause) {
 std::string inText(const Json& definition) {
   const std::string oid = definition["oid"];
   const std::string kind = definition["kind"];
-  std::string text =
-      spaced(kind) + " " +
-      (kind == "vendor-extension" ? oid : definition["name"].get<std::string>() + " (" + oid + ")");
+  std::string text = spaced(kind) + (kind == "vendor-extension" ? " of " : " ") +
+                     definition["name"].get<std::string>() + " (" + oid + ")";
   text += ": " + classWord(definition) + " -> " + definition["outcome"].get<std::string>();
   const std::string risk = definition["risk"];
   text += (risk == "none" ? "" : " [" + risk + "]") + "\n";

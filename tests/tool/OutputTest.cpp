@@ -355,22 +355,36 @@ TEST_P(Unwritable, DefinitionIsToldFromTheOthers) {
   }
 }
 
-// The library's writer makes one of two superiors; the text as OLD has it says both.
-TEST(SecondSuperior, StaysInNewsLayoutAlone) {
+// The library's writer makes one of two superiors: nothing is lost without a decision.
+TEST(SecondSuperior, HasToBeDecided) {
   const ToolFolder folder;
   const std::string line = "attributetypes=( 1.1 NAME 'a' SUP b SUP c )\n";
   const std::string others =
       "attributetypes=( 1.2 NAME 'b' OBSOLETE )\nattributetypes=( 1.3 NAME 'c' OBSOLETE )\n";
   folder.install("old", {{"V3.user.at", line + others}});
   folder.install("new", {{"V3.user.at", others}});
-  const ToolResult refused = folder.migrate();
-  EXPECT_EQ(4, refused.exitCode);
-  EXPECT_NE(std::string::npos, refused.err.find("attribute type a (1.1) is not in the result\n"))
-      << refused.err;
-  EXPECT_EQ("new old", folder.names());
-  EXPECT_EQ(0,
-            folder.run({"migrate", "--from", "@/old", "--to", "@/new", "--out", "@/out"}).exitCode);
-  EXPECT_NE(std::string::npos, folder.contents("out")["V3.user.at"].find(line));
+  folder.write("d.toml",
+               "[[definition]]\nkind = \"attribute-type\"\noid = \"1.1\"\ntext = \"( 1.1 NAME 'a' "
+               "SUP b )\"\n");
+  for (const std::string layout : {"keep", "library"}) {
+    std::vector<std::string> words = {"migrate", "--from", "@/old",    "--to", "@/new",
+                                      "--out",   "@/out",  "--layout", layout};
+    const ToolResult refused = folder.run(words);
+    EXPECT_EQ(4, refused.exitCode);
+    EXPECT_EQ(
+        "@/old/V3.user.at:1:16: error: attribute type a (1.1) would not be read again as it is "
+        "written: a value in quotes that is neither a name nor a description, an empty value and a "
+        "second SUP do not survive; decide what comes of it, with a text of its own or NEW's, or "
+        "exclude its OID\n",
+        refused.err.substr(0, refused.err.find('\n') + 1));
+    EXPECT_EQ("d.toml new old", folder.names());
+    words.insert(words.end(), {"--decisions", "@/d.toml"});
+    EXPECT_EQ(0, folder.run(words).exitCode);
+    const std::string written = folder.contents("out")["V3.user.at"];
+    EXPECT_NE(std::string::npos, written.find("SUP b")) << written;
+    EXPECT_EQ(std::string::npos, written.find("SUP c")) << written;
+    std::filesystem::remove_all(folder.file("out"));
+  }
 }
 
 INSTANTIATE_TEST_SUITE_P(Rows, Unwritable, testing::ValuesIn(kRows),
