@@ -23,6 +23,8 @@ struct ToldClause {
   Risk risk = Risk::kNone;
   bool isDecided = true;
 };
+
+// Each clause of the change that differs somewhere.
 std::vector<ToldClause> toldClauses(const ClauseChange& change);
 
 // Their names: "SUP", "EQUALITY, SYNTAX".
@@ -33,6 +35,8 @@ struct ToldValue {
   std::string name;
   std::string value;
 };
+
+// The clauses of an aspect that these values are written in.
 std::vector<ToldValue> toldValues(Aspect aspect, const Values& values);
 
 }  // namespace migration
