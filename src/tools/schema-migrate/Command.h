@@ -41,6 +41,7 @@ std::unique_ptr<Command> makeCompletionCommand();
 std::unique_ptr<Command> makeDecideCommand();
 std::unique_ptr<Command> makeDiffCommand();
 std::unique_ptr<Command> makeExplainCommand();
+std::unique_ptr<Command> makeFleetCommand();
 std::unique_ptr<Command> makeMigrateCommand();
 std::unique_ptr<Command> makePlanCommand();
 std::unique_ptr<Command> makeShowCommand();

@@ -181,6 +181,7 @@ Commands allCommands() {
   commands.push_back(makeDecideCommand());
   commands.push_back(makeDiffCommand());
   commands.push_back(makeExplainCommand());
+  commands.push_back(makeFleetCommand());
   commands.push_back(makeMigrateCommand());
   commands.push_back(makePlanCommand());
   commands.push_back(makeShowCommand());

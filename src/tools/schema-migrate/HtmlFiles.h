@@ -7,6 +7,7 @@ namespace html {
 
 extern const char kPlanTemplate[];
 extern const char kCheckTemplate[];
+extern const char kFleetTemplate[];
 extern const char kStyle[];
 extern const char kScript[];
 

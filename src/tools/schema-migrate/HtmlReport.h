@@ -16,4 +16,7 @@ std::string renderPlanHtml(const std::string& document);
 // Of `check`: what renderJson() gives.
 std::string renderCheckHtml(const std::string& document);
 
+// Of `fleet`: what renderJson() gives.
+std::string renderFleetHtml(const std::string& document);
+
 #endif  // SCHEMA_MIGRATE_HTML_REPORT_H

@@ -11,8 +11,6 @@
 #include "PlanReport.h"
 #include "Progress.h"
 
-namespace {
-
 std::unique_ptr<migration::Source> readPlanFile(const std::string& path,
                                                 migration::Failures* failures) {
   // A plan tells of every definition more than the definition says.
@@ -21,8 +19,6 @@ std::unique_ptr<migration::Source> readPlanFile(const std::string& path,
   limits.bytes = kMost;
   return migration::readSource(path, limits, failures);
 }
-
-}  // namespace
 
 void refuseUnlessPlanCanBeSaved(const std::string& path) {
   struct stat status {};

@@ -9,6 +9,10 @@
 #include <memory>
 #include <string>
 
+// Its bytes; null, and a failure, when they cannot be had. A plan may be larger than other inputs.
+std::unique_ptr<migration::Source> readPlanFile(const std::string& path,
+                                                migration::Failures* failures);
+
 // Throws a Failure unless a plan may be saved as `path`: it does not exist, or is a saved plan,
 // which is replaced.
 void refuseUnlessPlanCanBeSaved(const std::string& path);
