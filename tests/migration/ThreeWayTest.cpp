@@ -613,6 +613,20 @@ TEST(ThreeWay, WhatNewHasOnlyInAConfigFileStaysUndecided) {
   }
 }
 
+// The library's merge adds nothing to V3.modifiedschema.
+TEST(ThreeWay, AnExtensionOfWhatNewHasInModifiedSchemaIsUndecided) {
+  const Installation base = installationOf("BASE", {{"V3.modifiedschema", kPlain}});
+  const Installation old = installationOf(
+      "OLD", {{"V3.modifiedschema", kPlain}, {"V3.user.at", orv("1.1 DBNAME ( 'a' )")}});
+  const Installation latest = installationOf("NEW", {{"V3.modifiedschema", kPlain}});
+  const ThreeWay result =
+      migration::compareThreeWay({&base, &old, &latest, {}, {}, Prefer::kOld, {}, false});
+  ASSERT_EQ(result.differences.size(), 2U);
+  EXPECT_EQ(outcomeOf(result.differences.back()),
+            "vendor extension 1.1: added by site -> undecided (NEW has its attribute type in a "
+            "config file or in V3.modifiedschema, to which the library adds nothing)");
+}
+
 // Nor what lies behind such a definition, or before one.
 TEST(ThreeWay, WhatHasToStayNewsIsUndecidedWhereTheSiteChangedIt) {
   const std::string extension = orv("1.1 DBNAME ( 'a' )");

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <cstddef>
+#include <map>
 #include <nlohmann/json.hpp>
 #include <string>
 #include <vector>
@@ -168,6 +169,34 @@ void expectInOrder(const std::vector<std::string>& parts, const std::string& tex
   }
 }
 
+// In the text each finding has its line, or is counted among those of its rule and directory; diff
+// tells of differences alone.
+void expectFindings(const Json& document, const std::string& text) {
+  std::map<std::string, std::size_t> counts;  // by what stands before and behind a count
+  std::map<std::string, std::size_t> told;
+  for (const Json& finding : document["findings"]) {
+    const std::string file = finding["file"];
+    const std::string group =
+        file.substr(0, file.rfind('/')) + ": warning: # [" + finding["rule"].get<std::string>();
+    const std::string line = file + ":" + std::to_string(finding["line"].get<std::size_t>()) + ":" +
+                             std::to_string(finding["column"].get<std::size_t>()) + ": " +
+                             finding["severity"].get<std::string>() + ": " +
+                             finding["text"].get<std::string>();
+    ++counts[group];
+    told[group] += text.find("\n" + line) == std::string::npos ? 0 : 1;
+  }
+  for (const auto& [group, count] : counts) {
+    if (document["command"] == "diff") {
+      EXPECT_EQ(0U, told[group]) << group;
+      continue;
+    }
+    std::string more = "\n" + group + "]\n";
+    more.replace(more.find('#'), 1, std::to_string(count - told[group]) + " more like this");
+    EXPECT_NE(0U, told[group]) << group;
+    EXPECT_EQ(told[group] != count, text.find(more) != std::string::npos) << more;
+  }
+}
+
 // ---- The runs ----
 
 struct Run {
@@ -211,10 +240,7 @@ TEST_P(Formats, SayTheSame) {
       EXPECT_NE(std::string::npos, pageText.find(finding["text"].get<std::string>()));
     }
   }
-  for (const Json& finding : document["findings"]) {
-    const bool isPlan = document["command"] != "diff";
-    EXPECT_EQ(isPlan, text.find(finding["text"].get<std::string>()) != std::string::npos);
-  }
+  expectFindings(document, text);
   for (const Json& refusal : document["refusals"]) {
     EXPECT_NE(std::string::npos, pageText.find(refusal["text"].get<std::string>()));
   }

@@ -4,6 +4,7 @@
 #include <sys/wait.h>
 
 #include <cstdlib>
+#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -176,6 +177,70 @@ TEST_F(Planned, PlanTellsTheFindingsOnItsInputs) {
        {"V3.user.at:2:", "[T301]", "V3.more", "[I702]", "oids:1:1", "[O503]"}) {
     EXPECT_NE(findings.find(finding), std::string::npos) << finding << "\n" << findings;
   }
+}
+
+// A habit of writing is told once for each side, and counted; the document has each place.
+TEST_F(Planned, PlanCountsTheWarningsThatSayTheSame) {
+  std::string comments;
+  for (int number = 0; number < 4; ++number) {
+    comments += "# one\n" + at("3." + std::to_string(number) + " NAME 'x" + std::to_string(number) +
+                               "' USAGE userApplications");
+  }
+  for (const char* const side : {"base", "old", "new"}) {
+    m_folder.write(side + std::string("/V3.config.at"), comments);
+  }
+  const ToolResult result = run("plan", {"--base", "@/base"});
+  const auto count = [&](const std::string& text, const std::string& wanted) {
+    std::size_t number = 0;
+    for (std::size_t at = text.find(wanted); at != std::string::npos;
+         at = text.find(wanted, at + 1)) {
+      ++number;
+    }
+    return number;
+  };
+  EXPECT_EQ(3U, count(result.out, "V3.config.at is read but never written")) << result.out;
+  EXPECT_NE(std::string::npos, result.out.find("@/base: warning: 3 more like this [T305]\n"));
+  EXPECT_NE(std::string::npos,
+            result.out.find("Each of them is told by check, and by --format json and --html.\n"));
+  const std::string document = run("plan", {"--base", "@/base", "--format", "json"}).out;
+  EXPECT_EQ(12U, count(document, "V3.config.at is read but never written"));
+}
+
+// Where one directory is two of the inputs.
+TEST_F(Planned, AFindingIsToldOnce) {
+  m_folder.write("new/V3.config.at", at("3.1 NAME 'x' USAGE userApplications"));
+  const std::string document =
+      run("plan", {"--base", "@/new", "--accept-base", "--format", "json"}).out;
+  const std::size_t first = document.find("V3.config.at is read but never written");
+  EXPECT_NE(std::string::npos, first);
+  EXPECT_EQ(std::string::npos, document.find("V3.config.at is read but never written", first + 1));
+}
+
+TEST_F(Planned, DiffOfANameTellsItsExtensionToo) {
+  m_folder.write("old/V3.system.at",
+                 at("1.1 NAME 'a' DESC 'd' USAGE userApplications") +
+                     at("1.2 NAME 'b' DESC 'better' USAGE userApplications") +
+                     orv("1.2 DBNAME ( 'b' 'b' ) ACCESS-CLASS normal LENGTH 9"));
+  const ToolResult result = run("diff", {"--base", "@/base", "b"});
+  EXPECT_EQ(0U, result.out.find("vendor extension of b (1.2): changed by site -> old [structure]\n"))
+      << result.out;
+  EXPECT_EQ(std::string::npos, result.out.find("attribute type")) << result.out;
+  EXPECT_EQ(1, result.exitCode);
+}
+
+TEST_F(Planned, APageInTheOutputIsAnErrorOfUsage) {
+  std::filesystem::create_directory(m_folder.file("out"));
+  for (const char* const option : {"--out", "--record"}) {
+    const bool isRecord = option == std::string("--record");
+    const std::string other = isRecord ? "@/record" : "@/out";
+    const ToolResult result = run("migrate", {"--base", "@/base", "--out", "@/out", "--record",
+                                              "@/record", "--html", other + "/page.html"});
+    EXPECT_EQ(2, result.exitCode);
+    EXPECT_EQ("schema-migrate: error: --html " + other + "/page.html lies in the directory that " +
+                  option + " creates; name a file elsewhere\n",
+              result.err);
+  }
+  EXPECT_TRUE(std::filesystem::is_empty(m_folder.file("out")));
 }
 
 TEST_F(Planned, MigrateCarriesTheSitesChangesAndKeepsTheReleases) {

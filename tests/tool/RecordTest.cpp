@@ -11,6 +11,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
+#include <nlohmann/json.hpp>
 
 #include "Files.h"
 #include "Machine.h"
@@ -156,6 +157,30 @@ TEST_F(Record, ItsSumsAreThoseOfEveryFile) {
   for (const auto& [name, bytes] : record()) {
     EXPECT_EQ(name == "SHA256SUMS", sums.find("  " + name + "\n") == std::string::npos) << name;
   }
+}
+
+// As the inputs were read, whose sums the plan has; what was mended in private copies is told.
+TEST_F(Record, OfARepairedRunHasTheInputsAsTheyWereRead) {
+  for (const char* const side : {"base", "old", "new"}) {
+    m_folder.write(side + std::string("/V3.system.oc"),
+                   support::readWholeFile(m_folder.file(side + std::string("/V3.system.oc"))) +
+                       "objectclasses=( 2.8 NAME 'm' ABSTRACT X-ORIGIN 'us' )\n");
+  }
+  const ToolResult result = migrate({"--repair"});
+  ASSERT_EQ(0, result.exitCode) << result.err;
+  for (const char* const side : {"base", "old", "new"}) {
+    EXPECT_EQ(m_folder.contents(side), m_folder.contents("record/" + std::string(side)));
+  }
+  EXPECT_EQ(0, shell("cd '" + m_folder.file("record") + "' && sha256sum --quiet -c SHA256SUMS"));
+  const auto plan = nlohmann::json::parse(record().at("plan.json"));
+  const std::string sums = record().at("SHA256SUMS");
+  for (const auto& input : plan.at("inputs")) {
+    EXPECT_NE(std::string::npos, sums.find(input.at("sha256").get<std::string>()))
+        << input.at("path");
+  }
+  EXPECT_EQ(3U, plan.at("repairs").size());
+  EXPECT_NE(std::string::npos,
+            recorded("report.txt").find("mended in a private copy: a comment of X-ORIGIN [D201]"));
 }
 
 TEST_F(Record, TellsWhereEachDefinitionCameFrom) {

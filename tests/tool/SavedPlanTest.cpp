@@ -126,7 +126,7 @@ TEST_F(SavedPlan, HoldsTheDefinitions) {
   EXPECT_EQ(json({{"base", {{"file", m_folder.file("base/V3.system.oc")}, {"line", 1}}},
                   {"old", {{"file", m_folder.file("old/V3.system.oc")}, {"line", 1}}},
                   {"new", {{"file", m_folder.file("new/V3.system.oc")}, {"line", 1}}},
-                  {"result", {{"file", "result/V3.system.oc"}, {"line", 1}}}}),
+                  {"result", {{"file", "V3.system.oc"}, {"line", 1}}}}),
             plan["definitions"][4]["places"]);
   EXPECT_EQ(json({{"clause", "MAY"},
                   {"base", "a"},

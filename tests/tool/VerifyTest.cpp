@@ -4,8 +4,11 @@
 #include <sys/stat.h>
 
 #include <filesystem>
+#include <nlohmann/json.hpp>
+#include <utility>
 
 #include "Files.h"
+#include "Json.h"
 #include "PlannedFolder.h"
 
 namespace {
@@ -55,6 +58,40 @@ TEST_F(Verify, TheLibrarysLayoutIsVerified) {
       result.out);
   EXPECT_EQ(0, result.exitCode);
   EXPECT_EQ("", m_folder.privateCopies());
+}
+
+TEST_F(Verify, TheDocumentTellsWhatTheTextTells) {
+  const auto document = [&] {
+    const ToolResult result =
+        m_folder.run({"verify", "--plan", "@/plan.json", "@/out", "--format", "json"});
+    EXPECT_EQ("", result.err);
+    if (canValidateJson()) {
+      EXPECT_EQ("", problemsOf(result.out, VERIFY_SCHEMA));
+    }
+    return std::pair(nlohmann::json::parse(result.out), result.exitCode);
+  };
+  const auto [good, done] = document();
+  EXPECT_EQ(0, done);
+  EXPECT_EQ(true, good.at("verified"));
+  EXPECT_EQ("keep", good.at("layout"));
+  EXPECT_EQ(nlohmann::json::array(), good.at("differences"));
+  EXPECT_EQ(7, good.at("counts").at("definitions"));
+
+  edit("out/V3.system.at", "SINGLE-VALUE", "SYNTAX 1.2{3}");
+  const auto [bad, found] = document();
+  EXPECT_EQ(1, found);
+  EXPECT_EQ(false, bad.at("verified"));
+  ASSERT_EQ(2U, bad.at("differences").size());
+  const nlohmann::json& difference = bad.at("differences").front();
+  EXPECT_EQ("@/out/V3.system.at", difference.at("file"));
+  EXPECT_EQ(nlohmann::json(
+                {{{"clause", "SYNTAX"}, {"planned", nullptr}, {"found", "1.2{3}"}},
+                 {{"clause", "SINGLE-VALUE"}, {"planned", "SINGLE-VALUE"}, {"found", nullptr}}}),
+            difference.at("clauses"));
+  const std::string text = verify().out;
+  for (const nlohmann::json& each : bad.at("differences")) {
+    EXPECT_NE(std::string::npos, text.find(each.at("text").get<std::string>())) << text;
+  }
 }
 
 // A release that the library wrote: its files begin as the library's do, in either layout.

@@ -115,6 +115,7 @@ class CheckCommand : public Command {
                     errorLine("--repair takes one DIR; schema-migrate check --help tells how "
                               "it is used"));
     }
+    m_html.refuseIn("--repair", m_repair.out);
     m_html.open();
     progress::step("reading and checking");
     const CheckReport report = m_repair.out.empty() ? checkDirectories(m_options)

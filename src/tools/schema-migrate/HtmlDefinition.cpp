@@ -64,6 +64,25 @@ Names::Mark markOn(const Json& definition, const Json& clause, const std::string
 
 std::string textAt(const Json& json, const char* member) { return json.at(member); }
 
+std::string joined(const Json& words) {
+  std::string text;
+  for (const Json& word : words) {
+    text.append(text.empty() ? "" : ", ").append(word.get<std::string>());
+  }
+  return text;
+}
+
+// "take: old, new; clauses: SYNTAX (old, new, base); rename, renumber".
+std::string choicesOf(const Json& question) {
+  std::string text = "take: " + joined(question.at("take"));
+  std::string clauses;
+  for (const Json& clause : question.at("clauses")) {
+    clauses += (clauses.empty() ? "; clauses: " : ", ") + textAt(clause, "clause") + " (" +
+               joined(clause.at("take")) + ")";
+  }
+  return text + clauses + (question.at("move").get<bool>() ? "; rename, renumber" : "");
+}
+
 }  // namespace
 
 void DefinitionWriter::addHead(const Json& definition, std::size_t at, Dictionary* row) const {
@@ -94,6 +113,9 @@ void DefinitionWriter::addReason(const Json& definition, std::size_t at, Diction
     for (const Json& note : definition.at("notes")) {
       m_names.addSentence("PART", note, at, notes->AddSectionDictionary("NOTE"));
     }
+  }
+  if (definition.at("question").is_object()) {
+    addText(row, "ASKED", "CHOICES", choicesOf(definition.at("question")));
   }
   if (definition.at("decision").is_string()) {
     addText(row, "DECIDED", "PLACE", textAt(definition, "decision"));

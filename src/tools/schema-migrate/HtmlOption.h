@@ -16,6 +16,10 @@ class HtmlOption {
 
   bool isWanted() const { return !m_path.empty(); }
 
+  // Throws a Failure, a wrong command line, when the page would lie in the directory that `option`
+  // creates; an empty one is none.
+  void refuseIn(const std::string& option, const std::string& directory) const;
+
   // To be called before the work is done: throws a Failure where no page can be written. Does
   // nothing when none is wanted.
   void open();

@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include <array>
+#include <atomic>
 #include <csignal>
 #include <string_view>
 
@@ -12,6 +13,7 @@
 namespace {
 
 constexpr std::array<int, 3> kSignals = {SIGINT, SIGTERM, SIGHUP};
+constexpr std::string_view kNoOutput = "schema-migrate: error: interrupted\n";
 constexpr std::string_view kNotInPlace =
     "schema-migrate: error: interrupted; the output directory was not written\n";
 constexpr std::string_view kInPlace =
@@ -22,9 +24,11 @@ constexpr std::string_view kWithoutRecord =
 constexpr std::string_view kWithRecord =
     "schema-migrate: error: interrupted; the output directory and the record are complete and in place\n";
 
+std::atomic<bool> isOutputExpected{false};
+
 std::string_view messageOf(const Removals::Placed& placed) {
   if (placed.inPlace == 0) {
-    return kNotInPlace;
+    return isOutputExpected ? kNotInPlace : kNoOutput;
   }
   if (placed.wanted == 1) {
     return kInPlace;
@@ -61,5 +65,7 @@ void install() {
 }
 
 Removals* removals() { return &everything; }
+
+void expectOutput() { isOutputExpected = true; }
 
 }  // namespace interruption

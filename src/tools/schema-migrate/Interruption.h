@@ -15,6 +15,9 @@ void install();
 // What an interruption removes.
 Removals* removals();
 
+// From now on the run makes an output directory, of which an interruption has to tell.
+void expectOutput();
+
 }  // namespace interruption
 
 #endif  // SCHEMA_MIGRATE_INTERRUPTION_H

@@ -45,7 +45,7 @@ this program made it, or when it says something else.
 
 --record creates, beside DIR, what a change ticket needs, as one new directory:
   plan.json            the plan, as plan --save writes it
-  report.txt           what is printed here
+  report.txt           what is printed here, with every finding
   report.html          the same as a page for a browser
   origins.tsv          where each written definition came from: file and line,
                        and those of the decision about it

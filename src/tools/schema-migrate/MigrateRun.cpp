@@ -61,7 +61,7 @@ void report(const MigrationPlan& plan, const MigrateOptions& options, HtmlOption
   if (options.isJson) {
     console->print(document);
   } else {
-    console->printText(renderFindings(plan) +
+    console->printText(renderFindings(plan, Told::kFirst) +
                        renderDifferences(plan, shownOf(plan, {}), {isColourWanted(), false}));
   }
 }
@@ -160,7 +160,10 @@ void publishBoth(const MigrateOptions& options, OutputDirectory* output, OutputD
 void migrate(const PlanOptions& planOptions, const MigrateOptions& options, HtmlOption* html,
              Console* console) {
   static_cast<void>(timeWanted());
+  html->refuseIn("--out", options.out);
+  html->refuseIn("--record", options.record.path);
   html->open();
+  interruption::expectOutput();
   Removals* const removals = interruption::removals();
   std::string warnings;
   OutputDirectory output(outputOptions(planOptions, options), removals, &warnings);

@@ -96,7 +96,7 @@ class PlanCommand : public Command {
     if (isJson) {
       console->print(document);
     } else {
-      console->printText(renderFindings(*plan) +
+      console->printText(renderFindings(*plan, Told::kFirst) +
                          renderDifferences(*plan, shownOf(*plan, {}), style) + "\n" +
                          renderReadiness(*plan, style));
     }

@@ -209,6 +209,25 @@ bool isRefused(const MigrationPlan& plan, const migration::Finding& finding) {
                      });
 }
 
+std::string directoryOf(const migration::Finding& finding) {
+  const std::size_t slash = finding.file.rfind('/');
+  return slash == std::string::npos ? finding.file : finding.file.substr(0, slash);
+}
+
+// Warnings of one rule in one directory, of which only the first are told.
+std::string groupOf(const migration::Finding& finding) {
+  const bool isError = finding.severity == migration::Severity::kError;
+  return (isError ? "e " : "w ") + finding.rule + " " + directoryOf(finding);
+}
+
+// What warns of a habit of writing says the same at each place.
+std::size_t mostTold(const migration::Finding& finding) {
+  constexpr std::size_t kMost = 10;
+  const bool isHabit = finding.rule.front() == 'L' || finding.rule == "T305" ||
+                       finding.rule == "T306" || finding.rule == "T307" || finding.rule == "R405";
+  return isHabit ? 1 : kMost;
+}
+
 std::string lineOf(const migration::Failure& failure) {
   return errorLine(placeTold(failure), textTold(failure));
 }
@@ -269,12 +288,30 @@ std::string renderDifferences(const MigrationPlan& plan, const ShownDifferences&
   return writer.take();
 }
 
-std::string renderFindings(const MigrationPlan& plan) {
-  std::string lines;
+std::string renderFindings(const MigrationPlan& plan, Told told) {
+  std::map<std::string, std::size_t> counts;
   for (const migration::Finding& finding : plan.ofInputs) {
-    lines += finding.severity == migration::Severity::kError
-                 ? errorLine(placeTold(finding), textTold(finding))
-                 : warningLine(placeTold(finding), textTold(finding));
+    ++counts[groupOf(finding)];
+  }
+  std::string lines;
+  bool isAnyLeftOut = false;
+  std::map<std::string, std::size_t> seen;
+  for (const migration::Finding& finding : plan.ofInputs) {
+    const std::size_t count = counts[groupOf(finding)];
+    const std::size_t most = told == Told::kAll ? count : mostTold(finding);
+    const std::size_t number = ++seen[groupOf(finding)];
+    if (finding.severity == migration::Severity::kError) {
+      lines += errorLine(placeTold(finding), textTold(finding));
+    } else if (number <= most || count == most + 1) {
+      lines += warningLine(placeTold(finding), textTold(finding));
+    } else if (number == most + 1) {
+      lines += warningLine(directoryOf(finding),
+                           std::to_string(count - most) + " more like this [" + finding.rule + "]");
+      isAnyLeftOut = true;
+    }
+  }
+  if (isAnyLeftOut) {
+    lines += "Each of them is told by check, and by --format json and --html.\n";
   }
   std::string repairs;
   for (const migration::Finding& repair : plan.repairs) {

@@ -38,8 +38,10 @@ std::string renderDifferences(const migration::MigrationPlan& plan, const ShownD
                               const PlanStyle& style);
 
 // What was mended in private copies of the inputs, and what the rules of check say of them, a line
-// each; empty when there is nothing.
-std::string renderFindings(const migration::MigrationPlan& plan);
+// each; empty when there is nothing. Where a rule warns of many places in a directory, only the
+// first are told and the others counted, unless all are wanted.
+enum class Told { kFirst, kAll };
+std::string renderFindings(const migration::MigrationPlan& plan, Told told);
 
 // A line for each definition that counts for nothing, and for each file that is not read, for
 // standard error.

@@ -48,8 +48,9 @@ migration::RecordRequest recordRequest(const migration::MigrationPlan& plan,
   all.isWithSame = true;
   migration::RecordRequest request;
   request.plan = &plan;
-  request.textReport = renderFindings(plan) + renderDifferences(plan, shownOf(plan, {}), {}) +
-                       "\n" + summaryOf(plan, outputs, isInLibraryLayout);
+  request.textReport = renderFindings(plan, Told::kAll) +
+                       renderDifferences(plan, shownOf(plan, {}), {}) + "\n" +
+                       summaryOf(plan, outputs, isInLibraryLayout);
   request.htmlReport = renderPlanHtml(renderPlanJson(plan, shownOf(plan, all), "migrate"));
   request.outputs = std::move(outputs);
   request.layout = isInLibraryLayout ? "library" : "keep";

@@ -15,6 +15,7 @@ CheckReport repairDirectory(const CheckOptions& options, const RepairOptions& re
   const mode_t mask = ::umask(0);
   ::umask(mask);
   Removals* const removals = interruption::removals();
+  interruption::expectOutput();
   const std::string& directory = options.directories.front();
   std::string warnings;
   OutputDirectory output({repairOptions.out, {directory}, repairOptions.allowForeignParent, mask},

@@ -48,18 +48,23 @@ class VerifyCommand : public Command {
         ->required()
         ->check(notEmpty())
         ->type_name("");
+    verify->add_option("--format", m_format, "text or json")
+        ->check(oneOf({"text", "json"}))
+        ->type_name("FORMAT");
     addMaxInput(verify, &m_options.limits);
     return verify;
   }
 
   int run(Console* console) override {
     const VerifyReport report = verify(m_options, console);
-    console->print(renderVerification(report, m_options));
+    console->print(m_format == "json" ? renderVerificationJson(report, m_options)
+                                      : renderVerification(report, m_options));
     return report.isVerified() ? kDone : kFindings;
   }
 
  private:
   VerifyOptions m_options;
+  std::string m_format = "text";
 };
 
 }  // namespace

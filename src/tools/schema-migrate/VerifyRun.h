@@ -36,6 +36,9 @@ struct VerifyReport {
 // Failure when the plan or the directory cannot be read.
 VerifyReport verify(const VerifyOptions& options, Console* console);
 
+// As docs/json/verify.schema.json says.
+std::string renderVerificationJson(const VerifyReport& report, const VerifyOptions& options);
+
 // For people.
 std::string renderVerification(const VerifyReport& report, const VerifyOptions& options);
 

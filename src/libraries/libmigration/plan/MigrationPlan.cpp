@@ -56,6 +56,9 @@ class PlanMaker {
       return std::move(m_plan);
     }
     checkInputs();
+    // One directory may be two of the inputs.
+    dropRepeated(&m_plan->ofInputs);
+    dropRepeated(&m_plan->repairs);
     tell("comparing");
     m_plan->threeWay = compareThreeWay(m_plan->request);
     doubtBase();
@@ -66,6 +69,20 @@ class PlanMaker {
   }
 
  private:
+  using PlaceKey = std::tuple<std::string, std::uint64_t, std::uint64_t, std::string, std::string>;
+  static PlaceKey keyOfPlace(const Finding& finding) {
+    return {finding.file, finding.line, finding.column, finding.rule, finding.text};
+  }
+
+  static void dropRepeated(Findings* findings) {
+    std::set<PlaceKey> told;
+    findings->erase(std::remove_if(findings->begin(), findings->end(),
+                                   [&](const Finding& finding) {
+                                     return !told.insert(keyOfPlace(finding)).second;
+                                   }),
+                    findings->end());
+  }
+
   void tell(const char* step) const {
     if (m_request.onStep) {
       m_request.onStep(step);
@@ -109,6 +126,10 @@ class PlanMaker {
     }
     readSettings(directory);
     if (m_request.isRepaired) {
+      std::vector<NamedText>& read = m_plan->asRead[role];
+      for (const SchemaFile& file : installation.files()) {
+        read.push_back({file.name, std::string(file.source->bytes()), file.mode});
+      }
       installation = repaired(installation);
     }
     for (const SchemaFile& file : installation.files()) {
@@ -243,7 +264,8 @@ class PlanMaker {
   void refuseLoss(const Finding& finding) {
     const bool isLoss =
         finding.rule.front() == 'L' || finding.rule.front() == 'D' || finding.rule == "O501";
-    if (isLoss && finding.severity == Severity::kError) {
+    if (isLoss && finding.severity == Severity::kError &&
+        m_losses.insert(keyOfPlace(finding)).second) {
       m_plan->refusals.push_back(
           {finding.file, finding.line, finding.column, finding.rule, finding.text});
     }
@@ -272,6 +294,7 @@ class PlanMaker {
   std::unique_ptr<MigrationPlan> m_plan;
   std::vector<const Source*> m_excludeLists;
   const Source* m_withdrawList = nullptr;
+  std::set<PlaceKey> m_losses;  // that refuse already
 };
 
 }  // namespace

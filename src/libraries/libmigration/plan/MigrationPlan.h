@@ -49,8 +49,10 @@ struct MigrationPlan {
   std::vector<PlanInput> inputs;
   ThreeWay threeWay;
 
-  // What was mended, at its places in the files. Everything else is of the mended texts.
+  // What was mended, at its places in the files. Everything else is of the mended texts; the files
+  // as they were read are kept beside them, by "base", "old" and "new".
   Findings repairs;
+  std::map<std::string, std::vector<NamedText>> asRead;
 
   // What the rules say of BASE, OLD and NEW, of the lists, and of the result what neither OLD nor
   // NEW had. What the settings of a directory accept is left out.

@@ -75,8 +75,16 @@ class RecordMaker {
   }
 
   void addInstallation(const std::string& folder, const Installation& installation) {
-    for (const SchemaFile& file : installation.files()) {
-      add(folder, file.name, std::string(file.source->bytes()));
+    const auto asRead = m_plan.asRead.find(folder);
+    if (asRead == m_plan.asRead.end()) {
+      for (const SchemaFile& file : installation.files()) {
+        add(folder, file.name, std::string(file.source->bytes()));
+      }
+    } else {
+      // As the sums of the plan have them; what was mended is told.
+      for (const NamedText& text : asRead->second) {
+        add(folder, text.name, text.bytes);
+      }
     }
     m_copied += folder + "/: copies of the files of " + quoted(installation.directory()) + "\n";
   }

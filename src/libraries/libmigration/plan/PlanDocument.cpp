@@ -69,6 +69,14 @@ Json otherClausesOf(const Verdict& row) {
   return clauses;
 }
 
+// The files of the result are those of the output directory, wherever that is.
+Json placeInResult(const Entry* entry) {
+  if (entry == nullptr) {
+    return nullptr;
+  }
+  return {{"file", entry->file->name}, {"line", entry->place().line}};
+}
+
 const Entry* inResult(const MigrationPlan& plan, const Verdict& row) {
   if (!row.isInResult() || !plan.result) {
     return nullptr;
@@ -124,7 +132,7 @@ Json definitionOf(const MigrationPlan& plan, const Verdict& row) {
            {{"base", placeOf(row.match.base)},
             {"old", placeOf(row.match.old)},
             {"new", placeOf(row.match.latest)},
-            {"result", placeOf(inResult(plan, row))}}}};
+            {"result", placeInResult(inResult(plan, row))}}}};
 }
 
 // To those of the definitions that somebody has to decide.

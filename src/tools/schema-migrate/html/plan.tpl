@@ -67,6 +67,7 @@
 {{#ALIKE}}<tr><th scope="row">{{ALIKE_NAME}}</th><td colspan="{{WIDTH}}">{{#OTHER}}{{CLAUSE_NAME}} {{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}{{#OTHER_separator}} · {{/OTHER_separator}}{{/OTHER}}</td></tr>{{/ALIKE}}
 </tbody></table>
 {{#NOTES}}<ul class="notes">{{#NOTE}}<li>{{#PART}}{{#TO}}<a href="#d{{N}}">{{/TO}}{{TEXT}}{{#TO_END}}</a>{{/TO_END}}{{/PART}}</li>{{/NOTE}}</ul>{{/NOTES}}
+{{#ASKED}}<p>Can be decided by <code>{{CHOICES}}</code></p>{{/ASKED}}
 {{#DECIDED}}<p>Decided in <code>{{PLACE}}</code></p>{{/DECIDED}}
 </article>
 {{/DEFINITION}}
