@@ -5,12 +5,13 @@
 {
   packages_to_build=(g++ cmake ninja-build libcli11-dev libctemplate-dev libssl-dev libtomlplusplus-dev
     nlohmann-json3-dev pkg-config scdoc)
-  packages_to_test=(abigail-tools binutils libgtest-dev libldap-dev python3-jsonschema valgrind man-db
+  packages_to_test=(abigail-tools ansible-core binutils libgtest-dev libldap-dev python3-jsonschema valgrind man-db
     devscripts doxygen chromium chromium-driver poppler-utils python3-selenium
     bash-completion fish pre-commit zsh)
   packages_to_package=(debhelper dpkg-dev devscripts doxygen fakeroot lintian locales xz-utils)
   packages_to_compare=(abigail-tools binutils xz-utils)
-  packages_to_check=(clang clang-tidy clang-format libbenchmark-dev)
+  # openssh-server starts a server on a machine that has none: not for the tests of everybody.
+  packages_to_check=(clang clang-tidy clang-format libbenchmark-dev openssh-client openssh-server)
 }
 
 # missing_packages PACKAGE...: those that are not installed, one on a line.

@@ -27,13 +27,16 @@ expect "runtime" "$(for name in libschema-migration libschema-platform; do
   printf '%s\n' "$lib/$name.so.1" "$lib/$name.so.1.$VERSION"
 done
 printf '%s\n' "$lib/libschema.so.2" "$lib/libschema.so.$VERSION")" "$(files runtime)"
-expect "tool but for manual pages" "./bin/schema-migrate
+expect "tool but for manual pages and the collection" "./bin/schema-migrate
 ./share/bash-completion/completions/schema-migrate
 ./share/fish/vendor_completions.d/schema-migrate.fish
-./share/zsh/site-functions/_schema-migrate" "$(files tool | grep -v '^./share/man/')"
+./share/zsh/site-functions/_schema-migrate" "$(files tool | grep -vE '^./share/(man|ansible)/')"
 expect "manual pages of the tool" "" "$(files tool | grep '^./share/man/' | grep -vE '/man[15]/schema-migrate' || true)"
 expect "manual pages for programs" "./share/man/man3/libschema-migration.3
 ./share/man/man3/libschema.3" "$(files development | grep '^./share/man/')"
+sources=$(dirname "$0")/../../ansible
+expect "collection" "$(files "$sources" | grep '^./ansible_collections/' | grep -v '/__pycache__/')" \
+  "$(files tool/share/ansible/collections)"
 expect "development outside of its folders" "$(for name in libschema-migration libschema-platform libschema
 do
   printf '%s\n' "$lib/$name.a" "$lib/$name.so"
