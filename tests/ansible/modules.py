@@ -72,7 +72,7 @@ def plan(bench):
     expect("the first of them", {
         "kind": "attribute-type", "oid": "0.9.2342.19200300.100.1.4", "name": "info",
         "class": "changed-by-both-in-conflict", "outcome": "undecided", "risk": "data", "decision": None,
-        "reason": "the site and the release changed it in two ways: MATCHING"}, result["undecided"][0])
+        "reason": "the site and the release changed it in two ways: SYNTAX"}, result["undecided"][0])
     template = (bench.folder / "undecided.toml").read_text()
     # An extension that goes with its attribute type has no entry.
     expect("entries of the template", 10, template.count("[[definition]]"))
