@@ -94,6 +94,36 @@ def large_installations(folder, number):
               {"V3.user.at": "".join(lines), "V3.user.oc": "".join(classes)})
 
 
+def fleet(examples):
+    """Plans of five installations of one release, customised differently, saved beside the pages."""
+    plans = []
+    for name, changes, options in (
+            ("oslo", [], []),
+            ("bergen", [("8192", "9000")], []),
+            ("narvik", [("320", "384")], []),
+            ("bodo", [], ["--decisions", os.path.join(examples, "decisions.toml")]),
+            ("hamar", None, ["--accept-base"])):
+        folder = os.path.join(FOLDER, "fleet-installations", name)
+        shutil.copytree(os.path.join(examples, "base" if changes is None else "old"), folder)
+        for file in os.listdir(folder):
+            path = os.path.join(folder, file)
+            with open(path, encoding="utf-8") as text:
+                changed = text.read()
+            for old, new in changes or []:
+                changed = changed.replace(old, new)
+            with open(path, "w", encoding="utf-8") as text:
+                text.write(changed)
+        plans.append(os.path.join(FOLDER, name + "-plan.json"))
+        save(["--base", os.path.join(examples, "base"), "--from", folder,
+              "--to", os.path.join(examples, "new"), *options], plans[-1])
+    return plans
+
+
+def save(arguments, path):
+    subprocess.run([TOOL, "plan", *arguments, "--save", path], stdout=subprocess.DEVNULL,
+                   stderr=subprocess.DEVNULL, check=False)
+
+
 shutil.rmtree(FOLDER, ignore_errors=True)
 os.makedirs(FOLDER)
 run("plan", ["plan", *sides(EXAMPLES)], (4,))
@@ -107,6 +137,10 @@ HOSTILE_FOLDER = os.path.join(FOLDER, "<img src=x onerror=alert(1)>")
 hostile_installations(HOSTILE_FOLDER)
 run("hostile", ["diff", *sides(HOSTILE_FOLDER)], (1,))
 run("hostile-check", ["check", os.path.join(HOSTILE_FOLDER, "old")], (1,))
+HOSTILE_PLAN = os.path.join(FOLDER, "hostile-plan.json")
+save(sides(HOSTILE_FOLDER), HOSTILE_PLAN)
+run("hostile-fleet", ["fleet", "<script>alert(2)<img>=" + HOSTILE_PLAN], (4,))
+run("fleet", ["fleet", *fleet(EXAMPLES)], (4,))
 
 LARGE_FOLDER = os.path.join(FOLDER, "large-installations")
 large_installations(LARGE_FOLDER, 10000)

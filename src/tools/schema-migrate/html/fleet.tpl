@@ -75,7 +75,7 @@
 <table><thead><tr><th scope="col">Definition</th>{{#COLUMN}}<th scope="col">{{TEXT}}</th>{{/COLUMN}}</tr></thead>
 <tbody>{{#ROW}}<tr><th scope="row"><a href="#d{{AT}}">{{NAME}}</a></th>{{#CELL}}<td><span class="sign {{STYLE_CLASS}}">{{SIGN}}</span></td>{{/CELL}}</tr>{{/ROW}}</tbody></table>
 </div>
-<p><small>= unchanged, ~ changed, + added, − removed, · not there, ? without BASE otherwise than in NEW; the number tells in which way, as below; ! undecided.</small></p>
+<p><small>= unchanged, ~ changed, + added, − removed, · not there, ? without BASE otherwise than in NEW; the number tells which of those below; ! undecided.</small></p>
 <ul class="notes">{{#LEGEND}}<li>{{TEXT}}</li>{{/LEGEND}}</ul>
 {{/MATRIX}}
 {{#DEFINITION}}
@@ -93,8 +93,10 @@
 {{/RELEASE}}
 <section id="installations" aria-labelledby="installations-heading">
 <h2 id="installations-heading">Installations <span class="number">{{INSTALLATION_COUNT}}</span></h2>
+<div class="wide" tabindex="0" role="group" aria-label="Installations">
 <table class="findings"><thead><tr><th scope="col">Installation</th><th scope="col">State</th><th scope="col" class="number">Release</th><th scope="col" class="number">Questions</th><th scope="col" class="number">Refusals</th><th scope="col">Plan</th></tr></thead>
 <tbody>{{#INSTALLATION}}<tr><th scope="row">{{NAME}}</th><td><span class="sign {{STYLE_CLASS}}" aria-hidden="true">{{SIGN}}</span>{{STATE}}</td><td class="number">{{RELEASE_NUMBER}}</td><td class="number">{{QUESTIONS}}</td><td class="number">{{REFUSALS}}</td><td><code>{{PATH}}</code></td></tr>{{/INSTALLATION}}</tbody></table>
+</div>
 </section>
 </main>
 </div>
