@@ -58,7 +58,7 @@ run_tests() {
 
 install_package() {
   "$CMAKE" --build "$BUILD/project" -j "$(nproc)" --target \
-    src/libraries/libschema/all src/libraries/libmigration/all src/tools/schema-migrate/all
+    src/libraries/libschema/all src/libraries/libmigration/all src/tools/schema-migrate/all docs/man/all
   rm -rf "$BUILD/installed"
   "$CMAKE" --install "$BUILD/project" --prefix "$BUILD/installed"
   # The server's own take the place of these.
