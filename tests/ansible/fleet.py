@@ -129,15 +129,19 @@ class Fleet:
         hosts = {name: site.variables for name, site in self.sites.items()}
         (self.root / "inventory.json").write_text(json.dumps({"all": {"vars": everywhere, "hosts": hosts}}))
 
-    def play(self, *arguments, **variables):
+    # With a group, its process group stands in that file, so that it can be killed.
+    def play(self, *arguments, group=None, **variables):
         self.write_inventory()
         command = ["ansible-playbook", "-i", str(self.root / "inventory.json"), str(self.control / "upgrade.yml"),
                    *arguments]
         if variables:
             command += ["--extra-vars", json.dumps(variables)]
-        done = subprocess.run(command, env=self.environment(), cwd=self.control, stdin=subprocess.DEVNULL,
-                              stdout=subprocess.PIPE, stderr=subprocess.STDOUT, check=False)
-        return Played(done.stdout.decode(), done.returncode)
+        playing = subprocess.Popen(command, env=self.environment(), cwd=self.control, stdin=subprocess.DEVNULL,
+                                   stdout=subprocess.PIPE, stderr=subprocess.STDOUT, start_new_session=True)
+        if group:
+            group.write_text(str(playing.pid))
+        text = playing.communicate()[0].decode()
+        return Played(text, playing.returncode)
 
     def by_hand(self, site, original, out):
         """What the tool itself makes of the site: the same options, another way."""
