@@ -3,8 +3,8 @@
 #
 #   0 src/platform
 #   1 libschema's trace points      2 its lexical analyser    3 its definitions    4 its manager
-#   5 libmigration/text             6 model                   7 rules              8 plan
-#   9 tools: installed headers only
+#   5 libmigration/text             6 output    7 model       8 rules              9 plan
+#  10 tools: installed headers only
 
 function floor_of(path) {
   if (path ~ /^src\/platform\//) return 0
@@ -15,10 +15,11 @@ function floor_of(path) {
     return 4
   }
   if (path ~ /^src\/libraries\/libmigration\/text\//) return 5
-  if (path ~ /^src\/libraries\/libmigration\/model\//) return 6
-  if (path ~ /^src\/libraries\/libmigration\/rules\//) return 7
-  if (path ~ /^src\/libraries\/libmigration\/plan\//) return 8
-  return 9
+  if (path ~ /^src\/libraries\/libmigration\/output\//) return 6
+  if (path ~ /^src\/libraries\/libmigration\/model\//) return 7
+  if (path ~ /^src\/libraries\/libmigration\/rules\//) return 8
+  if (path ~ /^src\/libraries\/libmigration\/plan\//) return 9
+  return 10
 }
 
 function library_of(path,   parts) {

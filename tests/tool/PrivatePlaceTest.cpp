@@ -1,8 +1,7 @@
 // Where private copies lie.
 
-#include "PrivatePlace.h"
-
 #include <gtest/gtest.h>
+#include <libschema-migration/PrivatePlace.h>
 #include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -10,22 +9,25 @@
 #include <ctime>
 #include <filesystem>
 #include <fstream>
+#include <memory>
 
 #include "DiagnosticPlace.h"
 #include "Files.h"
 #include "Machine.h"
-#include "Messages.h"
 #include "SmallFileSystem.h"
 
 namespace {
 
 namespace fs = std::filesystem;
 
+using migration::PrivatePlace;
+using migration::PrivatePlaceOptions;
+
 constexpr char kNoOpenFiles[] = "/nonexistent";
 
 // In a user namespace that has no root, whatever is root's seems to be somebody else's.
-#define SKIP_UNLESS_ROOT_IS_KNOWN()        \
-  if (!isBeyondOthers(folder.file("one"))) \
+#define SKIP_UNLESS_ROOT_IS_KNOWN()                   \
+  if (!migration::isBeyondOthers(folder.file("one"))) \
   GTEST_SKIP() << "here the folder of the test belongs neither to root nor to the user"
 
 class PrivatePlaceIn : public testing::Test {
@@ -38,19 +40,24 @@ class PrivatePlaceIn : public testing::Test {
 
   // The candidate that is taken, as "one" or "two", or what is told when none is.
   std::string taken(const PrivatePlaceOptions& options) {
-    try {
-      const PrivatePlace place(options, &removals, &warnings);
-      std::ofstream(place.pathOf("file")) << "text";
-      const fs::path path = place.own().directory().path();
-      EXPECT_EQ("text", support::readWholeFile((path / "file").string()));
-      struct stat status {};
-      EXPECT_EQ(0, ::stat(path.c_str(), &status));
-      EXPECT_EQ(0700U, status.st_mode & 0777U);
-      return path.parent_path().filename().string();
-    } catch (const Failure& failure) {
-      EXPECT_EQ(kNotWritten, failure.exitCode());
-      return failure.what();
+    migration::Failures failures;
+    migration::Failures leftovers;
+    const std::unique_ptr<PrivatePlace> place =
+        PrivatePlace::make(options, &removals, &failures, &leftovers);
+    for (const migration::Failure& left : leftovers) {
+      warnings += left.file + ": " + left.text + "\n";
     }
+    EXPECT_EQ(place == nullptr ? 1U : 0U, failures.size());
+    if (place == nullptr) {
+      return failures.front().file + ": " + failures.front().text;
+    }
+    std::ofstream(place->pathOf("file")) << "text";
+    const fs::path path = place->shownPath();
+    EXPECT_EQ("text", support::readWholeFile((path / "file").string()));
+    struct stat status {};
+    EXPECT_EQ(0, ::stat(path.c_str(), &status));
+    EXPECT_EQ(0700U, status.st_mode & 0777U);
+    return path.parent_path().filename().string();
   }
 
   std::vector<std::string> both() const { return {folder.file("one"), folder.file("two")}; }
@@ -60,7 +67,7 @@ class PrivatePlaceIn : public testing::Test {
   }
 
   support::TemporaryDirectory folder;
-  Removals removals;
+  migration::Removals removals;
   std::string warnings;
 };
 
@@ -70,9 +77,9 @@ TEST_F(PrivatePlaceIn, FirstThatCanBeHad) {
   folder.write("file", "");
   EXPECT_EQ("two", taken({{folder.file("file"), folder.file("two")}}));
   EXPECT_EQ(
-      "schema-migrate: error: no place can be had for the private copies of the files that are read and written; " +
+      ": no place can be had for the private copies of the files that are read and written; " +
           folder.file("file") + ": Not a directory; " + folder.file("missing") +
-          ": No such file or directory; name one in TMPDIR\n",
+          ": No such file or directory; name another directory to make it in",
       taken({{folder.file("file"), folder.file("missing")}}));
   EXPECT_TRUE(fs::is_empty(folder.file("one")));
   EXPECT_TRUE(fs::is_empty(folder.file("two")));
@@ -85,12 +92,16 @@ TEST_F(PrivatePlaceIn, DirectoryOfOthersWhenItIsReachedByItself) {
     GTEST_SKIP() << "/proc is not mounted";
   }
   setMode("one", 0777);
-  const PrivatePlace place({both()}, &removals, &warnings);
+  migration::Failures failures;
+  migration::Failures leftovers;
+  const std::unique_ptr<PrivatePlace> place =
+      PrivatePlace::make({both()}, &removals, &failures, &leftovers);
+  ASSERT_NE(nullptr, place);
   fs::rename(folder.file("one"), folder.file("moved"));
   fs::create_directory(folder.file("one"));
-  const OwnDirectory& directory = place.own();
-  std::ofstream(place.pathOf("file")) << "text";
-  EXPECT_TRUE(fs::exists(folder.file("moved/" + directory.name() + "/file")));
+  std::ofstream(place->pathOf("file")) << "text";
+  const std::string name = fs::path(place->shownPath()).filename();
+  EXPECT_TRUE(fs::exists(folder.file("moved/" + name + "/file")));
 }
 
 TEST_F(PrivatePlaceIn, NoDirectoryOfOthersOtherwise) {
@@ -104,9 +115,9 @@ TEST_F(PrivatePlaceIn, NoDirectoryOfOthersOtherwise) {
   EXPECT_EQ("one", taken({both(), 0, kNoOpenFiles}));
   setMode("one", 0777);
   EXPECT_EQ(
-      "schema-migrate: error: no place can be had for the private copies of the files that are read and written; " +
+      ": no place can be had for the private copies of the files that are read and written; " +
           folder.file("one") +
-          ": other users can rename what is in it, or above it; name one in TMPDIR\n",
+          ": other users can rename what is in it, or above it; name another directory to make it in",
       taken({{folder.file("one")}, 0, kNoOpenFiles}));
   // Nor one below it.
   fs::create_directory(folder.file("one/below"));
@@ -134,7 +145,7 @@ TEST_F(PrivatePlaceIn, FirstWithRoom) {
 
 // What a killed run left is named, unless that run may be under way.
 TEST_F(PrivatePlaceIn, LeftoversAreNamed) {
-  const std::string left = folder.file("one/schema-migrate-abcdef");
+  const std::string left = folder.file("one/private-copies-abcdef");
   fs::create_directory(left);
   EXPECT_EQ("one", taken({both()}));
   EXPECT_EQ("", warnings);
@@ -148,7 +159,7 @@ TEST_F(PrivatePlaceIn, LeftoversAreNamed) {
   EXPECT_EQ("one", taken({both()}));
   EXPECT_EQ(
       left +
-          ": warning: private copies left behind by a run that was killed; they are not used, and can be removed\n",
+          ": private copies left behind by a run that was killed; they are not used, and can be removed\n",
       warnings);
   EXPECT_TRUE(fs::exists(left));
 }

@@ -198,8 +198,8 @@ TEST_F(SavedPlan, TellsWhereItCannotBeWritten) {
   const ToolResult nowhere = m_folder.runPlanned("plan", {"--save", "@/nowhere/plan.json"});
   EXPECT_EQ(5, nowhere.exitCode);
   EXPECT_EQ(
-      "@/nowhere/plan.json: error: cannot be created, as the directory to create it in "
-      "cannot be used: No such file or directory\n",
+      "@/nowhere/plan.json: error: the directory to write it in cannot be used: No such file or "
+      "directory\n",
       nowhere.err);
   const ToolResult directory = m_folder.runPlanned("plan", {"--save", "@/nowhere/"});
   EXPECT_EQ(5, directory.exitCode);

@@ -34,7 +34,7 @@ bool readAll(int file, std::string* bytes) {
 void syncDirectoryOf(const std::string& path) {
   const std::size_t slash = path.rfind('/');
   const std::string directory = slash == std::string::npos ? "." : path.substr(0, slash + 1);
-  const Descriptor opened(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+  const migration::Descriptor opened(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
   if (opened.isOpen()) {
     ::fsync(opened.number());
   }
@@ -60,7 +60,8 @@ AnswerFile::~AnswerFile() {
 
 void AnswerFile::open(bool isNew) {
   const int how = O_RDWR | O_APPEND | O_CLOEXEC | O_NONBLOCK | O_NOCTTY;
-  m_file = Descriptor(::open(m_path.c_str(), how | (isNew ? O_CREAT | O_EXCL : 0), 0666));
+  m_file =
+      migration::Descriptor(::open(m_path.c_str(), how | (isNew ? O_CREAT | O_EXCL : 0), 0666));
   struct stat status {};
   if (!m_file.isOpen() || ::fstat(m_file.number(), &status) != 0) {
     throw Failure(kNotWritten, errorLine(m_path, std::string("cannot be ") +
@@ -93,13 +94,13 @@ bool AnswerFile::isUnchanged() const {
   struct stat opened {};
   std::string bytes;
   return ::stat(m_path.c_str(), &named) == 0 && ::fstat(m_file.number(), &opened) == 0 &&
-         FileIdentity::of(named) == FileIdentity::of(opened) && readAll(m_file.number(), &bytes) &&
-         bytes == m_known;
+         migration::FileIdentity::of(named) == migration::FileIdentity::of(opened) &&
+         readAll(m_file.number(), &bytes) && bytes == m_known;
 }
 
 void AnswerFile::reopen() {
   m_sizes.clear();
-  m_file = Descriptor();
+  m_file = migration::Descriptor();
   open(!isThere(m_path));
   readWhole();
 }
@@ -121,7 +122,7 @@ migration::Decision AnswerFile::readBack(const std::string& entry,
 
 void AnswerFile::append(const std::string& entry) {
   const std::string text = asAppended(entry);
-  if (!writeAll(m_file.number(), text) || ::fsync(m_file.number()) != 0) {
+  if (!migration::writeAll(m_file.number(), text) || ::fsync(m_file.number()) != 0) {
     const int error = errno;
     shorten(m_known.size());
     throw Failure(kNotWritten,

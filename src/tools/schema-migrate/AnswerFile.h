@@ -5,12 +5,11 @@
 #define SCHEMA_MIGRATE_ANSWER_FILE_H
 
 #include <libschema-migration/Decisions.h>
+#include <libschema-migration/Descriptor.h>
 
 #include <cstddef>
 #include <string>
 #include <vector>
-
-#include "Descriptor.h"
 
 class AnswerFile {
  public:
@@ -51,7 +50,7 @@ class AnswerFile {
   void shorten(std::size_t size);
 
   std::string m_path;
-  Descriptor m_file;
+  migration::Descriptor m_file;
   bool m_isCreated = false;
   std::string m_known;
   std::vector<std::size_t> m_sizes;  // of the file before each entry

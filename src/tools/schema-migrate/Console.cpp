@@ -1,10 +1,10 @@
 #include "Console.h"
 
+#include <libschema-migration/Descriptor.h>
 #include <unistd.h>
 
 #include <cstdio>
 
-#include "Descriptor.h"
 #include "DisplayText.h"
 #include "Messages.h"
 #include "Progress.h"
@@ -30,7 +30,7 @@ void Console::printText(const std::string& text) { print(fitted(text, longestLin
 
 void Console::complain(std::string* text) {
   const progress::Silence silence;
-  if (!writeAll(STDERR_FILENO, asComplaint(*text))) {
+  if (!migration::writeAll(STDERR_FILENO, asComplaint(*text))) {
     throw Failure(kNotWritten, errorLine("a warning cannot be written to standard error"));
   }
   text->clear();

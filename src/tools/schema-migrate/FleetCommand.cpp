@@ -13,7 +13,7 @@
 #include "HtmlOption.h"
 #include "HtmlReport.h"
 #include "Messages.h"
-#include "NewFile.h"
+#include "Outputs.h"
 #include "PlanFile.h"
 #include "Progress.h"
 #include "Terminal.h"

@@ -4,7 +4,19 @@
 
 #include "CommandLine.h"
 #include "HtmlReport.h"
+#include "Interruption.h"
 #include "Messages.h"
+#include "Outputs.h"
+
+namespace {
+
+void failUnlessNone(const migration::Failures& failures) {
+  if (!failures.empty()) {
+    throw Failure(kNotWritten, errorLinesOf(failures));
+  }
+}
+
+}  // namespace
 
 void HtmlOption::declare(CLI::App* command) {
   command
@@ -26,11 +38,16 @@ void HtmlOption::refuseIn(const std::string& option, const std::string& director
 
 void HtmlOption::open() {
   if (isWanted()) {
-    m_file.emplace(m_path, kHtmlBeginning);
+    migration::Failures failures;
+    m_file = migration::NewFile::open(
+        {m_path, migration::Over::kFileOfItsKind, kHtmlBeginning, "report of this program"},
+        interruption::removals(), &failures);
+    failUnlessNone(failures);
   }
 }
 
 void HtmlOption::write(const std::string& page) {
-  m_file->write(page);
-  m_file->put();
+  migration::Failures failures;
+  static_cast<void>(m_file->write(page, &failures) && m_file->put(&failures));
+  failUnlessNone(failures);
 }

@@ -3,11 +3,11 @@
 #ifndef SCHEMA_MIGRATE_HTML_OPTION_H
 #define SCHEMA_MIGRATE_HTML_OPTION_H
 
-#include <CLI/CLI.hpp>
-#include <optional>
-#include <string>
+#include <libschema-migration/NewFile.h>
 
-#include "ReportFile.h"
+#include <CLI/CLI.hpp>
+#include <memory>
+#include <string>
 
 class HtmlOption {
  public:
@@ -28,7 +28,7 @@ class HtmlOption {
 
  private:
   std::string m_path;
-  std::optional<ReportFile> m_file;
+  std::unique_ptr<migration::NewFile> m_file;
 };
 
 #endif  // SCHEMA_MIGRATE_HTML_OPTION_H

@@ -26,7 +26,7 @@ constexpr std::string_view kWithRecord =
 
 std::atomic<bool> isOutputExpected{false};
 
-std::string_view messageOf(const Removals::Placed& placed) {
+std::string_view messageOf(const migration::Removals::Placed& placed) {
   if (placed.inPlace == 0) {
     return isOutputExpected ? kNotInPlace : kNoOutput;
   }
@@ -36,12 +36,12 @@ std::string_view messageOf(const Removals::Placed& placed) {
   return placed.inPlace == placed.wanted ? kWithRecord : kWithoutRecord;
 }
 
-Removals everything;
+migration::Removals everything;
 
 extern "C" void removeAndEnd(int /*signal*/) {
   const std::string_view message = messageOf(everything.run());
   progress::erase();
-  writeAll(STDERR_FILENO, message);
+  migration::writeAll(STDERR_FILENO, message);
   ::_exit(kNotWritten);
 }
 
@@ -64,7 +64,7 @@ void install() {
   }
 }
 
-Removals* removals() { return &everything; }
+migration::Removals* removals() { return &everything; }
 
 void expectOutput() { isOutputExpected = true; }
 

@@ -5,7 +5,7 @@
 #ifndef SCHEMA_MIGRATE_INTERRUPTION_H
 #define SCHEMA_MIGRATE_INTERRUPTION_H
 
-#include "Removals.h"
+#include <libschema-migration/Removals.h>
 
 namespace interruption {
 
@@ -13,7 +13,7 @@ namespace interruption {
 void install();
 
 // What an interruption removes.
-Removals* removals();
+migration::Removals* removals();
 
 // From now on the run makes an output directory, of which an interruption has to tell.
 void expectOutput();

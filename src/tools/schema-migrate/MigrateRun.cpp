@@ -1,48 +1,45 @@
 #include "MigrateRun.h"
 
 #include <libschema-migration/Execution.h>
-#include <sys/stat.h>
 
+#include <memory>
 #include <optional>
 #include <utility>
 #include <vector>
 
 #include "HtmlReport.h"
-#include "Interruption.h"
 #include "Messages.h"
 #include "MigrateSummary.h"
-#include "OutputDirectory.h"
+#include "Outputs.h"
 #include "PlanReport.h"
-#include "PrivatePlace.h"
 #include "Progress.h"
-#include "RunPlaces.h"
 #include "RunTime.h"
 #include "Terminal.h"
-#include "TextOutput.h"
 
 namespace {
 
 using migration::Execution;
 using migration::MigrationPlan;
 using migration::NamedText;
+using migration::OutputDirectory;
 
-OutputOptions outputOptions(const PlanOptions& planOptions, const MigrateOptions& options) {
-  const mode_t mask = ::umask(0);
-  ::umask(mask);
+migration::OutputOptions outputOptions(const PlanOptions& planOptions,
+                                       const MigrateOptions& options) {
   std::vector<std::string> inputs = {planOptions.request.old, planOptions.request.latest};
   if (!planOptions.request.base.empty()) {
     inputs.push_back(planOptions.request.base);
   }
-  OutputOptions place;
+  migration::OutputOptions place;
   place.path = options.out;
+  place.option = "--out";
   place.inputs = inputs;
   place.allowForeignParent = options.allowForeignParent;
-  place.mask = mask;
   return place;
 }
 
-OutputOptions recordPlace(const PlanOptions& planOptions, const MigrateOptions& options) {
-  OutputOptions place = outputOptions(planOptions, options);
+migration::OutputOptions recordPlace(const PlanOptions& planOptions,
+                                     const MigrateOptions& options) {
+  migration::OutputOptions place = outputOptions(planOptions, options);
   place.path = options.record.path;
   place.option = "--record";
   place.noun = "record";
@@ -84,12 +81,9 @@ void refuseUnlessReady(const MigrationPlan& plan) {
 
 // The result in the layout that is wanted, as the library came to it.
 std::vector<NamedText> execute(const MigrationPlan& plan, bool isInLibraryLayout,
-                               PrivatePlace* place) {
-  for (const char* const folder : migration::kExecutionFolders) {
-    place->makeDirectory(folder);
-  }
+                               const migration::PrivatePlace& place) {
   progress::step("carrying the plan out");
-  Execution execution = migration::execute(plan.request, plan.threeWay, place->path());
+  Execution execution = migration::execute(plan.request, plan.threeWay, place.path());
   if (!execution.failures.empty() && execution.departsFromPlan) {
     throw Failure(kRefused, linesOf(execution.failures) +
                                 errorLine("refused: the server's library does not come to what was "
@@ -111,8 +105,9 @@ std::vector<NamedText> execute(const MigrationPlan& plan, bool isInLibraryLayout
 }
 
 // A config file has the mode that NEW's has; the others get that of any new file.
-std::vector<OutputText> outputTexts(const MigrationPlan& plan, std::vector<NamedText> texts) {
-  std::vector<OutputText> outputs;
+std::vector<migration::OutputText> outputTexts(const MigrationPlan& plan,
+                                               std::vector<NamedText> texts) {
+  std::vector<migration::OutputText> outputs;
   outputs.reserve(texts.size());
   for (NamedText& text : texts) {
     const migration::SchemaFile* const file = plan.latest->file(text.name);
@@ -139,9 +134,9 @@ void summarize(const MigrateOptions& options, const std::string& summary, Consol
 // The output first: a record of what was not written would mislead.
 void publishBoth(const MigrateOptions& options, OutputDirectory* output, OutputDirectory* record) {
   try {
-    output->publish();
+    publish(output);
     if (record != nullptr) {
-      record->publish();
+      publish(record);
     }
   } catch (const Failure& failure) {
     if (record == nullptr || record->isPublished()) {
@@ -163,14 +158,13 @@ void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Html
   html->refuseIn("--out", options.out);
   html->refuseIn("--record", options.record.path);
   html->open();
-  interruption::expectOutput();
-  Removals* const removals = interruption::removals();
   std::string warnings;
-  OutputDirectory output(outputOptions(planOptions, options), removals, &warnings);
-  std::optional<OutputDirectory> record;
+  const std::unique_ptr<OutputDirectory> output =
+      openOutput(outputOptions(planOptions, options), &warnings);
+  std::unique_ptr<OutputDirectory> record;
   if (!options.record.path.empty()) {
     refuseUnlessApart(options.record.path, options.out);
-    record.emplace(recordPlace(planOptions, options), removals, &warnings);
+    record = openOutput(recordPlace(planOptions, options), &warnings);
   }
   console->complain(&warnings);
   const std::unique_ptr<MigrationPlan> plan = planOptions.makePlan();
@@ -180,18 +174,18 @@ void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Html
   refuseUnlessReady(*plan);
   std::string summary;
   {
-    PrivatePlace place(privatePlaceFor(options.out, plan->old->size() + plan->latest->size()),
-                       removals, &warnings);
+    const std::unique_ptr<migration::PrivatePlace> place =
+        makePrivatePlace(options.out, plan->old->size() + plan->latest->size(), &warnings);
     console->complain(&warnings);
-    std::vector<NamedText> texts = execute(*plan, options.isInLibraryLayout, &place);
+    std::vector<NamedText> texts = execute(*plan, options.isInLibraryLayout, *place);
     summary = "\n" + summaryOf(*plan, texts, options.isInLibraryLayout);
     progress::step("writing and verifying");
     if (record) {
       writeRecord(
           recordRequest(*plan, texts, options.out, options.record, options.isInLibraryLayout),
-          &*record);
+          record.get());
     }
-    writeTexts(outputTexts(*plan, std::move(texts)), &output);
+    fill(outputTexts(*plan, std::move(texts)), output.get());
   }
   const std::string shownOut = wholePrintable(options.out);
   if (options.isDryRun) {
@@ -200,7 +194,7 @@ void migrate(const PlanOptions& planOptions, const MigrateOptions& options, Html
               console);
     return;
   }
-  publishBoth(options, &output, record ? &*record : nullptr);
+  publishBoth(options, output.get(), record.get());
   summary += "Written and verified: " + shownOut + "\n";
   if (record) {
     summary += "Recorded: " + wholePrintable(options.record.path) + "\n";

@@ -9,7 +9,7 @@
 #include "HtmlOption.h"
 #include "HtmlReport.h"
 #include "Messages.h"
-#include "NewFile.h"
+#include "Outputs.h"
 #include "PlanFile.h"
 #include "PlanOptions.h"
 #include "PlanReport.h"

@@ -7,7 +7,7 @@
 #include <utility>
 
 #include "Messages.h"
-#include "NewFile.h"
+#include "Outputs.h"
 #include "PlanReport.h"
 #include "Progress.h"
 
@@ -44,7 +44,8 @@ void savePlan(const migration::MigrationPlan& plan, const std::string& path) {
   }
   refuseUnlessPlanCanBeSaved(path);
   struct stat status {};
-  const Over over = ::lstat(path.c_str(), &status) == 0 ? Over::kWhatIsThere : Over::kNothing;
+  const migration::Over over =
+      ::lstat(path.c_str(), &status) == 0 ? migration::Over::kFile : migration::Over::kNothing;
   writeNewFile(path, migration::planDocument(plan, {"plan", SCHEMA_MIGRATE_VERSION}), over);
 }
 

@@ -1,5 +1,6 @@
 #include "Progress.h"
 
+#include <libschema-migration/Descriptor.h>
 #include <sys/ioctl.h>
 #include <sys/time.h>
 #include <unistd.h>
@@ -11,8 +12,6 @@
 #include <cstddef>
 #include <cstdlib>
 #include <string_view>
-
-#include "Descriptor.h"
 
 namespace {
 
@@ -72,8 +71,8 @@ void draw() {
   line.cut(widthOfTerminal() - 1);
   const std::size_t length = line.length();
   line.pad(drawn.load());
-  writeAll(STDERR_FILENO, "\r");
-  writeAll(STDERR_FILENO, line.text());
+  migration::writeAll(STDERR_FILENO, "\r");
+  migration::writeAll(STDERR_FILENO, line.text());
   drawn.store(length);
 }
 
@@ -129,9 +128,9 @@ void erase() {
   if (const std::size_t length = drawn.exchange(0)) {
     Line blanks;
     blanks.pad(length);
-    writeAll(STDERR_FILENO, "\r");
-    writeAll(STDERR_FILENO, blanks.text());
-    writeAll(STDERR_FILENO, "\r");
+    migration::writeAll(STDERR_FILENO, "\r");
+    migration::writeAll(STDERR_FILENO, blanks.text());
+    migration::writeAll(STDERR_FILENO, "\r");
   }
 }
 

@@ -8,27 +8,12 @@
 #include "HtmlReport.h"
 #include "Messages.h"
 #include "MigrateSummary.h"
+#include "Outputs.h"
 #include "PlanReport.h"
 #include "RunTime.h"
-#include "TextOutput.h"
-
-namespace {
-
-// With a slash at its end, so that one path that begins as another lies in it.
-std::string folderPath(const std::string& path) {
-  return (std::filesystem::absolute(path) / "").lexically_normal().string();
-}
-
-bool begins(const std::string& text, const std::string& beginning) {
-  return text.compare(0, beginning.size(), beginning) == 0;
-}
-
-}  // namespace
 
 void refuseUnlessApart(const std::string& record, const std::string& out) {
-  const std::string recordPath = folderPath(record);
-  const std::string outPath = folderPath(out);
-  if (begins(recordPath, outPath) || begins(outPath, recordPath)) {
+  if (!migration::areApart(record, out)) {
     throw Failure(kUsage, errorLine("--record " + record + " and --out " + out +
                                     " must name two directories, neither in the other"));
   }
@@ -62,11 +47,11 @@ migration::RecordRequest recordRequest(const migration::MigrationPlan& plan,
   return request;
 }
 
-void writeRecord(const migration::RecordRequest& request, OutputDirectory* record) {
-  std::vector<OutputText> texts;
+void writeRecord(const migration::RecordRequest& request, migration::OutputDirectory* record) {
+  std::vector<migration::OutputText> texts;
   for (migration::RecordFile& file : migration::recordOf(request)) {
     texts.push_back(
         {std::move(file.name), std::move(file.bytes), std::nullopt, std::move(file.folder)});
   }
-  writeTexts(texts, record);
+  fill(texts, record);
 }

@@ -4,11 +4,10 @@
 #define SCHEMA_MIGRATE_RECORD_OUTPUT_H
 
 #include <libschema-migration/MigrationRecord.h>
+#include <libschema-migration/OutputDirectory.h>
 
 #include <string>
 #include <vector>
-
-#include "OutputDirectory.h"
 
 struct RecordOptions {
   std::string path;                // of the record; empty for none
@@ -27,6 +26,6 @@ migration::RecordRequest recordRequest(const migration::MigrationPlan& plan,
 
 // Creates the record, brings it to the disk, and makes sure that it is there; it is still to be
 // published. Throws a Failure when that cannot be done.
-void writeRecord(const migration::RecordRequest& request, OutputDirectory* record);
+void writeRecord(const migration::RecordRequest& request, migration::OutputDirectory* record);
 
 #endif  // SCHEMA_MIGRATE_RECORD_OUTPUT_H

@@ -2,24 +2,23 @@
 
 #include <sys/stat.h>
 
+#include <memory>
 #include <optional>
 #include <utility>
 #include <vector>
 
-#include "Interruption.h"
-#include "OutputDirectory.h"
-#include "TextOutput.h"
+#include "Outputs.h"
 
 CheckReport repairDirectory(const CheckOptions& options, const RepairOptions& repairOptions,
                             Console* console) {
-  const mode_t mask = ::umask(0);
-  ::umask(mask);
-  Removals* const removals = interruption::removals();
-  interruption::expectOutput();
   const std::string& directory = options.directories.front();
   std::string warnings;
-  OutputDirectory output({repairOptions.out, {directory}, repairOptions.allowForeignParent, mask},
-                         removals, &warnings);
+  migration::OutputOptions place;
+  place.path = repairOptions.out;
+  place.inputs = {directory};
+  place.allowForeignParent = repairOptions.allowForeignParent;
+  place.option = "--out";
+  const std::unique_ptr<migration::OutputDirectory> output = openOutput(place, &warnings);
   std::vector<migration::NamedText> files;
   CheckReport report = checkRepaired(options, repairOptions.out, &files);
   if (!report.failures.empty()) {
@@ -27,7 +26,7 @@ CheckReport repairDirectory(const CheckOptions& options, const RepairOptions& re
     return report;
   }
   console->complain(&warnings);
-  std::vector<OutputText> texts;
+  std::vector<migration::OutputText> texts;
   texts.reserve(files.size());
   for (migration::NamedText& file : files) {
     struct stat status {};
@@ -35,7 +34,7 @@ CheckReport repairDirectory(const CheckOptions& options, const RepairOptions& re
     texts.push_back({std::move(file.name), std::move(file.bytes),
                      isThere ? std::optional<mode_t>(status.st_mode & 07777) : std::nullopt});
   }
-  writeTexts(texts, &output);
-  output.publish();
+  fill(texts, output.get());
+  publish(output.get());
   return report;
 }

@@ -7,11 +7,9 @@
 #include <algorithm>
 #include <utility>
 
-#include "Interruption.h"
 #include "Messages.h"
+#include "Outputs.h"
 #include "PlanFile.h"
-#include "PrivatePlace.h"
-#include "RunPlaces.h"
 
 namespace {
 
@@ -77,12 +75,10 @@ PlannedFiles inLibraryLayout(const VerifyOptions& options, const MigrationPlan& 
     }
   }
   std::string warnings;
-  PrivatePlace place(privatePlaceFor(options.directory, size), interruption::removals(), &warnings);
+  const std::unique_ptr<migration::PrivatePlace> place =
+      makePrivatePlace(options.directory, size, &warnings);
   console->complain(&warnings);
-  for (const char* const folder : migration::kExecutionFolders) {
-    place.makeDirectory(folder);
-  }
-  migration::Execution execution = migration::execute(plan.request, plan.threeWay, place.path());
+  migration::Execution execution = migration::execute(plan.request, plan.threeWay, place->path());
   const bool isCarried = execution.failures.empty() && execution.notCarriedByLibrary.empty();
   return {isCarried ? std::move(execution.inLibraryLayout) : std::vector<migration::NamedText>(),
           true};

@@ -9,6 +9,8 @@
 #include <memory>
 #include <utility>
 
+namespace migration {
+
 namespace {
 
 constexpr int kFlags = O_RDONLY | O_DIRECTORY | O_CLOEXEC;
@@ -71,3 +73,5 @@ bool Directory::has(const std::string& name, const FileIdentity& identity) const
   struct stat status {};
   return look(name, &status) && FileIdentity::of(status) == identity;
 }
+
+}  // namespace migration

@@ -6,13 +6,16 @@
 #include <cerrno>
 #include <cstdlib>
 #include <ctime>
-#include <memory>
+#include <list>
+#include <utility>
 
-#include "Messages.h"
+#include "Directory.h"
+#include "OutputStop.h"
+#include "OwnDirectory.h"
+
+namespace migration {
 
 namespace {
-
-constexpr char kPrefix[] = "schema-migrate-";
 
 // A run that has made its place a moment ago may not have locked it yet.
 constexpr std::time_t kMoment = 60;  // seconds
@@ -66,34 +69,58 @@ bool isBeyondOthers(const std::string& path) {
   return true;
 }
 
-PrivatePlace::PrivatePlace(const PrivatePlaceOptions& options, Removals* removals,
-                           std::string* warnings)
-    : m_removals(removals) {
+// The place itself, whose making is stopped (OutputStop) where it cannot be done.
+class PrivatePlace::Parts {
+ public:
+  void make(const PrivatePlaceOptions& options, Removals* removals, Failures* leftovers);
+  void makeFolder(const std::string& name);
+
+  const std::string& path() const { return m_path; }
+  const std::string& shownPath() const { return m_own.directory().path(); }
+
+ private:
+  bool tryCandidate(const std::string& candidate, const PrivatePlaceOptions& options,
+                    bool needsRoom);
+  bool findPath(const std::string& openFiles);
+  void findLeftovers(const std::string& prefix, Failures* leftovers) const;
+
+  Removals m_ownRemovals;  // for who has none
+  Removals* m_removals = &m_ownRemovals;
+  std::string m_problems;  // of each candidate
+  Directory m_base{Descriptor(), ""};
+  OwnDirectory m_own;
+  std::string m_path;
+  std::list<OwnDirectory> m_directories;
+};
+
+void PrivatePlace::Parts::make(const PrivatePlaceOptions& options, Removals* removals,
+                               Failures* leftovers) {
+  if (removals != nullptr) {
+    m_removals = removals;
+  }
   for (const bool needsRoom : {true, false}) {
     for (const std::string& candidate : options.candidates) {
       if (tryCandidate(candidate, options, needsRoom)) {
-        findLeftovers(warnings);
+        findLeftovers(options.prefix, leftovers);
         return;
       }
     }
   }
-  throw Failure(
-      kNotWritten,
-      errorLine(
-          "no place can be had for the private copies of the files that are read and written" +
-          m_problems + "; name one in TMPDIR"));
+  stopOutput("",
+             "no place can be had for the private copies of the files that are read and written" +
+                 m_problems + "; " + options.advice);
 }
 
-bool PrivatePlace::tryCandidate(const std::string& candidate, const PrivatePlaceOptions& options,
-                                bool needsRoom) {
+bool PrivatePlace::Parts::tryCandidate(const std::string& candidate,
+                                       const PrivatePlaceOptions& options, bool needsRoom) {
   m_base = Directory(candidate);
   std::string problem;
   if (!m_base.isOpen()) {
-    problem = systemError(errno);
+    problem = textOfError(errno);
   } else if (needsRoom && !hasRoom(m_base, options.room)) {
     return false;
   } else {
-    problem = m_own.makeUnique(m_base, kPrefix, m_removals);
+    problem = m_own.makeUnique(m_base, options.prefix, m_removals);
     if (problem.empty() && findPath(options.openFiles)) {
       return true;
     }
@@ -108,7 +135,7 @@ bool PrivatePlace::tryCandidate(const std::string& candidate, const PrivatePlace
   return false;
 }
 
-bool PrivatePlace::findPath(const std::string& openFiles) {
+bool PrivatePlace::Parts::findPath(const std::string& openFiles) {
   m_path = openFiles + "/" + std::to_string(m_own.directory().number());
   if (leadsTo(m_path, m_own.identity())) {
     return true;
@@ -117,11 +144,10 @@ bool PrivatePlace::findPath(const std::string& openFiles) {
   return leadsTo(m_path, m_own.identity()) && isBeyondOthers(m_path);
 }
 
-void PrivatePlace::findLeftovers(std::string* warnings) const {
-  const std::string prefix = kPrefix;
+void PrivatePlace::Parts::findLeftovers(const std::string& prefix, Failures* leftovers) const {
   std::vector<std::string> names;
   if (!m_base.list(&names)) {
-    throw Failure(kNotWritten, errorLine(m_base.path(), "cannot be read: " + systemError(errno)));
+    stopOutputOfSystem(m_base.path(), "cannot be read");
   }
   for (const std::string& name : names) {
     struct stat status {};
@@ -130,19 +156,42 @@ void PrivatePlace::findLeftovers(std::string* warnings) const {
                        status.st_uid == ::geteuid() &&
                        status.st_mtime + kMoment < std::time(nullptr);
     if (isOwn && useOf(m_base, name) == Use::kLeftBehind) {
-      *warnings += warningLine(
-          m_base.pathOf(name),
-          "private copies left behind by a run that was killed; they are not used, and can be removed");
+      leftovers->push_back(
+          {m_base.pathOf(name), 0, 0, "",
+           "private copies left behind by a run that was killed; they are not used, and can be removed"});
     }
   }
 }
 
-const OwnDirectory& PrivatePlace::makeDirectory(const std::string& name) {
-  OwnDirectory& made = m_directories.emplace_back();
-  const std::string problem = made.make(m_own.directory(), name, m_removals);
+void PrivatePlace::Parts::makeFolder(const std::string& name) {
+  const std::string problem =
+      m_directories.emplace_back().make(m_own.directory(), name, m_removals);
   if (!problem.empty()) {
-    throw Failure(kNotWritten,
-                  errorLine(m_own.directory().pathOf(name), "cannot be created: " + problem));
+    m_directories.pop_back();
+    stopOutput(m_own.directory().pathOf(name), "cannot be created: " + problem);
   }
-  return made;
 }
+
+PrivatePlace::PrivatePlace() : m_parts(std::make_unique<Parts>()) {}
+PrivatePlace::~PrivatePlace() = default;
+
+std::unique_ptr<PrivatePlace> PrivatePlace::make(const PrivatePlaceOptions& options,
+                                                 Removals* removals, Failures* failures,
+                                                 Failures* leftovers) {
+  std::unique_ptr<PrivatePlace> place(new PrivatePlace);
+  const bool isMade =
+      runToEnd([&] { place->m_parts->make(options, removals, leftovers); }, failures);
+  return isMade ? std::move(place) : nullptr;
+}
+
+const std::string& PrivatePlace::path() const { return m_parts->path(); }
+
+std::string PrivatePlace::pathOf(const std::string& name) const { return path() + "/" + name; }
+
+const std::string& PrivatePlace::shownPath() const { return m_parts->shownPath(); }
+
+bool PrivatePlace::makeFolder(const std::string& name, Failures* failures) {
+  return runToEnd([&] { m_parts->makeFolder(name); }, failures);
+}
+
+}  // namespace migration

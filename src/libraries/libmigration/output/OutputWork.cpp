@@ -1,4 +1,4 @@
-#include "OutputDirectory.h"
+#include "OutputWork.h"
 
 #include <fcntl.h>
 #include <unistd.h>
@@ -7,81 +7,69 @@
 #include <cstdio>
 #include <utility>
 
-#include "Messages.h"
+#include "OutputStop.h"
 
-namespace {
+namespace migration {
 
-[[noreturn]] void fail(const std::string& path, const std::string& text) {
-  throw Failure(kNotWritten, errorLine(path, text));
-}
-
-[[noreturn]] void failSystem(const std::string& path, const std::string& text) {
-  const int error = errno;
-  fail(path, text + ": " + systemError(error));
-}
-
-}  // namespace
-
-OutputDirectory::OutputDirectory(const OutputOptions& options, Removals* removals,
-                                 std::string* warnings)
-    : m_place(options, warnings),
+OutputWork::OutputWork(const OutputOptions& options, Removals* removals, Failures* leftovers)
+    : m_place(options, leftovers),
       m_mask(options.mask),
       m_removals(removals),
       m_noun(options.noun) {}
 
-void OutputDirectory::create() {
+void OutputWork::create() {
   const std::string problem =
       m_own.makeUnique(m_place.parent(), m_place.partialPrefix(), m_removals);
   if (!problem.empty()) {
-    fail(m_place.path(),
-         "the " + m_noun + " cannot be created in " + m_place.parent().path() + ": " + problem);
+    stopOutput(m_place.path(), "the " + m_noun + " cannot be created in " +
+                                   m_place.parent().path() + ": " + problem);
   }
   m_own.setPlace(m_place.name());
 }
 
 // What is in it goes with the directory.
-void OutputDirectory::makeFolder(const std::string& name) {
+void OutputWork::makeFolder(const std::string& name) {
   const std::string path = directory().pathOf(name);
   if (::mkdirat(directory().number(), name.c_str(), 0700) != 0) {
-    failSystem(path, "cannot be created");
+    stopOutputOfSystem(path, "cannot be created");
   }
   Directory folder = directory().open(name);
   if (!folder.isOpen()) {
-    failSystem(path, "cannot be opened");
+    stopOutputOfSystem(path, "cannot be opened");
   }
   m_folders.emplace(name, std::move(folder));
 }
 
-const Directory& OutputDirectory::folder(const std::string& name) const {
+const Directory& OutputWork::folder(const std::string& name) const {
   return name.empty() ? directory() : m_folders.at(name);
 }
 
-void OutputDirectory::write(const OutputText& text) {
+void OutputWork::write(const OutputText& text) {
   const Directory& parent = folder(text.folder);
   const std::string path = parent.pathOf(text.name);
   Descriptor file(::openat(parent.number(), text.name.c_str(),
                            O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC,
                            text.mode ? 0600 : 0666));
   if (!file.isOpen()) {
-    failSystem(path, "cannot be created");
+    stopOutputOfSystem(path, "cannot be created");
   }
   if (!writeAll(file.number(), text.bytes)) {
-    failSystem(path, "cannot be written");
+    stopOutputOfSystem(path, "cannot be written");
   }
   if (text.mode && ::fchmod(file.number(), *text.mode) != 0) {
-    failSystem(path, "its mode cannot be set");
+    stopOutputOfSystem(path, "its mode cannot be set");
   }
   m_files.push_back({path, std::move(file)});
 }
 
 // All are on their way before the first is waited for, so that they go to the disk together.
-void OutputDirectory::sync() {
+void OutputWork::sync() {
   for (const Written& written : m_files) {
     static_cast<void>(::sync_file_range(written.file.number(), 0, 0, SYNC_FILE_RANGE_WRITE));
   }
   for (const Written& written : m_files) {
     if (::fsync(written.file.number()) != 0) {
-      failSystem(written.path, "cannot be brought to the disk");
+      stopOutputOfSystem(written.path, "cannot be brought to the disk");
     }
     // What is read back then comes from the disk. Not every file system does so, and none has to.
     static_cast<void>(::posix_fadvise(written.file.number(), 0, 0, POSIX_FADV_DONTNEED));
@@ -91,7 +79,7 @@ void OutputDirectory::sync() {
 
 // Owner and mode of the empty directory that it replaces, or the mode of any new directory, which
 // has the bit that hands the group down when its parent has it.
-void OutputDirectory::giveAttributes() {
+void OutputWork::giveAttributes() {
   const struct stat own = directory().status();
   mode_t mode = (0777 & ~m_mask) | (own.st_mode & S_ISGID);
   if (m_place.replacesEmpty()) {
@@ -99,52 +87,53 @@ void OutputDirectory::giveAttributes() {
     mode = replaced.st_mode & 07777;
     const bool isOther = own.st_uid != replaced.st_uid || own.st_gid != replaced.st_gid;
     if (isOther && ::fchown(directory().number(), replaced.st_uid, replaced.st_gid) != 0) {
-      failSystem(m_place.path(),
-                 "the owner of the empty directory cannot be given to the one that replaces it");
+      stopOutputOfSystem(
+          m_place.path(),
+          "the owner of the empty directory cannot be given to the one that replaces it");
     }
   }
   if (::fchmod(directory().number(), mode) != 0) {
-    failSystem(directory().path(), "its mode cannot be set");
+    stopOutputOfSystem(directory().path(), "its mode cannot be set");
   }
 }
 
-void OutputDirectory::publish() {
+void OutputWork::publish() {
   giveAttributes();
   for (const auto& [name, folder] : m_folders) {
     if (::fchmod(folder.number(), 0777 & ~m_mask) != 0 || ::fsync(folder.number()) != 0) {
-      failSystem(folder.path(), "cannot be brought to the disk");
+      stopOutputOfSystem(folder.path(), "cannot be brought to the disk");
     }
   }
   if (::fsync(directory().number()) != 0) {
-    failSystem(directory().path(), "cannot be brought to the disk");
+    stopOutputOfSystem(directory().path(), "cannot be brought to the disk");
   }
   if (!m_own.isAtItsName()) {
-    fail(
+    stopOutput(
         directory().path(),
         "something else was put in the place of this directory while the run was under way; nothing was published");
   }
   if (!m_place.isParentAtItsPath()) {
-    fail(
+    stopOutput(
         m_place.parent().path(),
         "something else was put in the place of this directory while the run was under way; nothing was published");
   }
   rename();
   if (!m_place.holds(m_own.identity())) {
     takeBack();
-    fail(
+    stopOutput(
         m_place.path(),
         "something else was put in the place of this run's directory while it was renamed; nothing was published, and what is there is not the output of this run");
   }
   m_own.keep();
   m_isPublished = true;
   if (::fsync(m_place.parent().number()) != 0) {
-    failSystem(m_place.path(),
-               "is complete and in place, but its entry cannot be brought to the disk");
+    stopOutputOfSystem(m_place.path(),
+                       "is complete and in place, but its entry cannot be brought to the disk");
   }
 }
 
 // Never over anything but an empty directory: a plain rename of a directory does not either.
-void OutputDirectory::rename() {
+void OutputWork::rename() {
   const int parent = m_place.parent().number();
   const char* const from = m_own.name().c_str();
   const char* const to = m_place.name().c_str();
@@ -156,17 +145,17 @@ void OutputDirectory::rename() {
     result = ::renameat(parent, from, parent, to);
   }
   if (result != 0 && (errno == EEXIST || errno == ENOTEMPTY)) {
-    fail(m_place.path(),
-         "something else was put there while this run was under way; it was left alone");
+    stopOutput(m_place.path(),
+               "something else was put there while this run was under way; it was left alone");
   }
   if (result != 0) {
-    failSystem(m_place.path(), "the finished directory cannot be renamed to this");
+    stopOutputOfSystem(m_place.path(), "the finished directory cannot be renamed to this");
   }
 }
 
 // What was renamed, which is not this run's directory, gets back the name that it had, or, when
 // that is taken by now, another one of its kind.
-void OutputDirectory::takeBack() {
+void OutputWork::takeBack() {
   const int parent = m_place.parent().number();
   const std::string other = m_place.partialPrefix() + randomSuffix();
   for (const std::string& name : {m_own.name(), other}) {
@@ -175,3 +164,5 @@ void OutputDirectory::takeBack() {
     }
   }
 }
+
+}  // namespace migration

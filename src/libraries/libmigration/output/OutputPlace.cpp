@@ -6,18 +6,16 @@
 #include <cerrno>
 #include <utility>
 
-#include "Messages.h"
+#include "OutputStop.h"
 #include "OwnDirectory.h"
+
+namespace migration {
 
 namespace {
 
-[[noreturn]] void fail(const std::string& path, const std::string& text) {
-  throw Failure(kNotWritten, errorLine(path, text));
-}
-
-[[noreturn]] void failSystem(const std::string& path, const std::string& text) {
-  const int error = errno;
-  fail(path, text + ": " + systemError(error));
+// Nothing on the system has to change, so it is about no file.
+[[noreturn]] void stopRequest(const std::string& text) {
+  throw OutputStop{{"", 0, 0, "", text}, true};
 }
 
 std::string withoutLastSlashes(std::string path) {
@@ -57,82 +55,86 @@ std::string parentOf(const std::string& path) {
   return slash == std::string::npos ? "." : slash == 0 ? "/" : shortened.substr(0, slash);
 }
 
-OutputPlace::OutputPlace(const OutputOptions& options, std::string* warnings)
+OutputPlace::OutputPlace(const OutputOptions& options, Failures* leftovers)
     : m_noun(options.noun), m_path(withoutLastSlashes(options.path)) {
   const std::size_t slash = m_path.rfind('/');
   const std::string parent = parentOf(m_path);
   m_name = m_path.substr(slash == std::string::npos ? 0 : slash + 1);
   if (m_name.empty() || m_name == "." || m_name == "..") {
-    throw Failure(kUsage, errorLine(options.option +
-                                    " must end in the name of the directory to create, not in \"" +
-                                    m_path + "\""));
+    stopRequest(options.option + " must end in the name of the directory to create, not in \"" +
+                m_path + "\"");
   }
   m_parent = Directory(parent);
   if (!m_parent.isOpen() && errno == ENOTDIR && ::access(parent.c_str(), F_OK) == 0) {
-    fail(m_path,
-         "the " + m_noun + " cannot be created in " + parent + ", which is not a directory");
+    stopOutput(m_path,
+               "the " + m_noun + " cannot be created in " + parent + ", which is not a directory");
   }
   if (!m_parent.isOpen()) {
-    failSystem(m_path, "the directory to create it in, " + parent + ", cannot be used");
+    stopOutputOfSystem(m_path, "the directory to create it in, " + parent + ", cannot be used");
   }
   for (const std::string& input : options.inputs) {
     checkIsOutside(input);
   }
-  checkParent(options.allowForeignParent);
+  checkParent(options);
   checkName();
-  findLeftovers(warnings);
+  findLeftovers(leftovers);
 }
 
 // The inputs are never written, and a directory inside one would be.
 void OutputPlace::checkIsOutside(const std::string& input) const {
   struct stat status {};
   if (::stat(input.c_str(), &status) == 0 && isWithin(m_parent, FileIdentity::of(status))) {
-    throw Failure(kUsage, errorLine("the " + m_noun + " " + m_path + " lies inside " + input +
-                                    ", which is only read; name a place outside"));
+    stopRequest("the " + m_noun + " " + m_path + " lies inside " + input +
+                ", which is only read; name a place outside");
   }
 }
 
 // Who may rename what lies in the parent could put something else in the place of the output.
-void OutputPlace::checkParent(bool allowForeign) const {
+void OutputPlace::checkParent(const OutputOptions& options) const {
   const struct stat status = m_parent.status();
   const bool isForeign = status.st_uid != 0 && status.st_uid != ::geteuid();
   const bool isOpen = (status.st_mode & S_IWOTH) != 0 && (status.st_mode & S_ISVTX) == 0;
-  if ((isForeign || isOpen) && !allowForeign) {
-    fail(
-        m_path,
-        "the directory to create it in, " + m_parent.path() + ", " +
-            (isForeign ? "belongs to another user (" + std::to_string(status.st_uid) + ")"
-                       : std::string("is writable by everybody and not sticky")) +
-            ", who could put something else in the place of the output; create it in a directory of your own, or take the risk with --allow-foreign-parent");
+  if ((!isForeign && !isOpen) || options.allowForeignParent) {
+    return;
   }
+  const std::string whose = isForeign
+                                ? "belongs to another user (" + std::to_string(status.st_uid) + ")"
+                                : std::string("is writable by everybody and not sticky");
+  const std::string risk =
+      options.riskOption.empty() ? "" : ", or take the risk with " + options.riskOption;
+  stopOutput(
+      m_path,
+      "the directory to create it in, " + m_parent.path() + ", " + whose +
+          ", who could put something else in the place of the output; create it in a directory of your own" +
+          risk);
 }
 
 void OutputPlace::checkName() {
   if (!m_parent.look(m_name, &m_replaced)) {
     if (errno != ENOENT) {
-      failSystem(m_path, "the " + m_noun + " cannot be looked at");
+      stopOutputOfSystem(m_path, "the " + m_noun + " cannot be looked at");
     }
     return;
   }
   if (!S_ISDIR(m_replaced.st_mode)) {
-    fail(m_path, "exists and is not a directory; the " + m_noun + " must be new or empty");
+    stopOutput(m_path, "exists and is not a directory; the " + m_noun + " must be new or empty");
   }
   const Directory existing = m_parent.open(m_name);
   std::vector<std::string> names;
   if (!existing.isOpen() || !existing.list(&names)) {
-    failSystem(m_path, "the " + m_noun + " cannot be read");
+    stopOutputOfSystem(m_path, "the " + m_noun + " cannot be read");
   }
   if (!names.empty()) {
-    fail(m_path, "the " + m_noun + " is not empty; name a new or an empty one");
+    stopOutput(m_path, "the " + m_noun + " is not empty; name a new or an empty one");
   }
   m_replacesEmpty = true;
 }
 
-void OutputPlace::findLeftovers(std::string* warnings) const {
+void OutputPlace::findLeftovers(Failures* leftovers) const {
   const std::string prefix = partialPrefix();
   std::vector<std::string> names;
   if (!m_parent.list(&names)) {
-    failSystem(m_parent.path(), "cannot be read");
+    stopOutputOfSystem(m_parent.path(), "cannot be read");
   }
   for (const std::string& name : names) {
     if (name.compare(0, prefix.size(), prefix) != 0) {
@@ -151,7 +153,7 @@ void OutputPlace::findLeftovers(std::string* warnings) const {
       case Use::kLeftBehind:
         break;
     }
-    *warnings += warningLine(m_parent.pathOf(name), text);
+    leftovers->push_back({m_parent.pathOf(name), 0, 0, "", text});
   }
 }
 
@@ -166,3 +168,5 @@ bool OutputPlace::isParentAtItsPath() const {
   return ::stat(m_parent.path().c_str(), &status) == 0 &&
          FileIdentity::of(status) == m_parent.identity();
 }
+
+}  // namespace migration

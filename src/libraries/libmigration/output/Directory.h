@@ -1,7 +1,7 @@
 // A directory that is reached by its descriptor, whatever becomes of its name.
 
-#ifndef SCHEMA_MIGRATE_DIRECTORY_H
-#define SCHEMA_MIGRATE_DIRECTORY_H
+#ifndef LIBSCHEMA_MIGRATION_DIRECTORY_H
+#define LIBSCHEMA_MIGRATION_DIRECTORY_H
 
 #include <sys/stat.h>
 
@@ -9,6 +9,8 @@
 #include <vector>
 
 #include "Descriptor.h"
+
+namespace migration {
 
 class Directory {
  public:
@@ -45,4 +47,6 @@ class Directory {
   std::string m_path;
 };
 
-#endif  // SCHEMA_MIGRATE_DIRECTORY_H
+}  // namespace migration
+
+#endif  // LIBSCHEMA_MIGRATION_DIRECTORY_H

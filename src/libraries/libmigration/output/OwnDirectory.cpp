@@ -11,7 +11,9 @@
 #include <ctime>
 #include <vector>
 
-#include "Messages.h"
+#include "OutputStop.h"
+
+namespace migration {
 
 namespace {
 
@@ -59,13 +61,13 @@ std::string OwnDirectory::make(const Directory& parent, const std::string& name,
   // Entered before it is there, so that an interruption finds it at any time.
   m_entry = removals->add(parent.number(), name);
   if (m_entry == nullptr) {
-    return systemError(ENAMETOOLONG);
+    return textOfError(ENAMETOOLONG);
   }
   if (::mkdirat(parent.number(), name.c_str(), 0700) != 0) {
     const int error = errno;
     forget();
     errno = error;
-    return systemError(error);
+    return textOfError(error);
   }
   std::string problem = open();
   if (!problem.empty()) {
@@ -92,12 +94,12 @@ std::string OwnDirectory::makeUnique(const Directory& parent, const std::string&
 std::string OwnDirectory::open() {
   Directory opened = m_parent->open(m_name);
   if (!opened.isOpen()) {
-    return "it cannot be opened: " + systemError(errno);
+    return "it cannot be opened: " + textOfError(errno);
   }
   const struct stat status = opened.status();
   std::vector<std::string> names;
   if (!opened.list(&names)) {
-    return "it cannot be read: " + systemError(errno);
+    return "it cannot be read: " + textOfError(errno);
   }
   const bool isOwn = status.st_uid == ::geteuid() && (status.st_mode & (S_IWGRP | S_IWOTH)) == 0;
   if (!isOwn || !names.empty()) {
@@ -150,3 +152,5 @@ Use useOf(const Directory& parent, const std::string& name) {
   }
   return errno == EWOULDBLOCK ? Use::kInUse : Use::kUnknown;
 }
+
+}  // namespace migration

@@ -3,8 +3,8 @@
 // neither read nor change what is in it, nor make this run touch anything else. It goes, with the
 // files in it, when the object does, unless it was kept.
 
-#ifndef SCHEMA_MIGRATE_OWN_DIRECTORY_H
-#define SCHEMA_MIGRATE_OWN_DIRECTORY_H
+#ifndef LIBSCHEMA_MIGRATION_OWN_DIRECTORY_H
+#define LIBSCHEMA_MIGRATION_OWN_DIRECTORY_H
 
 #include <sys/types.h>
 
@@ -13,6 +13,8 @@
 #include "Descriptor.h"
 #include "Directory.h"
 #include "Removals.h"
+
+namespace migration {
 
 class OwnDirectory {
  public:
@@ -70,4 +72,6 @@ enum class Use { kInUse, kLeftBehind, kUnknown };
 // Whether a run that is under way holds the directory `name` in `parent`.
 Use useOf(const Directory& parent, const std::string& name);
 
-#endif  // SCHEMA_MIGRATE_OWN_DIRECTORY_H
+}  // namespace migration
+
+#endif  // LIBSCHEMA_MIGRATION_OWN_DIRECTORY_H

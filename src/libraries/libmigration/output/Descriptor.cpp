@@ -6,6 +6,8 @@
 #include <cstddef>
 #include <utility>
 
+namespace migration {
+
 Descriptor::~Descriptor() {
   if (m_number >= 0) {
     ::close(m_number);
@@ -29,3 +31,5 @@ bool writeAll(int descriptor, std::string_view bytes) {
   }
   return true;
 }
+
+}  // namespace migration

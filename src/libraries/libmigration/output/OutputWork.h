@@ -1,32 +1,26 @@
-// The directory that a run produces. It is filled under a temporary name beside its place
-// (.NAME.partial-XXXXXX), brought to the disk, and then renamed into its place: it appears whole or
-// not at all. What is not published goes when the object does.
+// The directory that is made, below OutputDirectory. Its functions are stopped (OutputStop) where
+// something cannot be done.
 
-#ifndef SCHEMA_MIGRATE_OUTPUT_DIRECTORY_H
-#define SCHEMA_MIGRATE_OUTPUT_DIRECTORY_H
+#ifndef LIBSCHEMA_MIGRATION_OUTPUT_WORK_H
+#define LIBSCHEMA_MIGRATION_OUTPUT_WORK_H
 
 #include <map>
-#include <optional>
 #include <string>
 #include <vector>
 
+#include "OutputDirectory.h"
 #include "OutputPlace.h"
 #include "OwnDirectory.h"
 #include "Removals.h"
 
-struct OutputText {
-  std::string name;
-  std::string bytes;
-  std::optional<mode_t> mode;  // that of any new file without
-  std::string folder{};        // in the output; empty for the output itself
-};
+namespace migration {
 
-class OutputDirectory {
+class OutputWork {
  public:
   // Nothing is created yet; see OutputPlace.
-  OutputDirectory(const OutputOptions& options, Removals* removals, std::string* warnings);
-  OutputDirectory(const OutputDirectory&) = delete;
-  OutputDirectory& operator=(const OutputDirectory&) = delete;
+  OutputWork(const OutputOptions& options, Removals* removals, Failures* leftovers);
+  OutputWork(const OutputWork&) = delete;
+  OutputWork& operator=(const OutputWork&) = delete;
 
   // Creates the directory under its temporary name.
   void create();
@@ -45,7 +39,7 @@ class OutputDirectory {
   void sync();
 
   // Brings the directory itself to the disk and renames it into its place. It has the mode of any
-  // new directory, or mode and owner of the empty one that it replaces. Throws a Failure, with
+  // new directory, or mode and owner of the empty one that it replaces. Stopped, with
   // nothing published, when another directory was put in the place of this one.
   void publish();
 
@@ -71,4 +65,6 @@ class OutputDirectory {
   std::vector<Written> m_files;
 };
 
-#endif  // SCHEMA_MIGRATE_OUTPUT_DIRECTORY_H
+}  // namespace migration
+
+#endif  // LIBSCHEMA_MIGRATION_OUTPUT_WORK_H

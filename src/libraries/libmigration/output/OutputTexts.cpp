@@ -1,20 +1,19 @@
-#include "TextOutput.h"
+#include "OutputTexts.h"
 
 #include <fcntl.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
+#include <cstdint>
 #include <set>
 #include <string_view>
 
-#include "Messages.h"
+#include "OutputStop.h"
+
+namespace migration {
 
 namespace {
-
-[[noreturn]] void fail(const std::string& path, const std::string& text) {
-  throw Failure(kNotWritten, errorLine(path, text));
-}
 
 // How far a file is what it has to be.
 struct Comparison {
@@ -57,25 +56,25 @@ void verify(const Directory& directory, const OutputText& wanted) {
   const std::string path = directory.pathOf(wanted.name);
   const Comparison result = compare(directory, wanted);
   if (result.error != 0) {
-    fail(path, "cannot be read back: " + systemError(result.error));
+    stopOutput(path, "cannot be read back: " + textOfError(result.error));
   }
   if (!result.isAtItsEnd) {
     const auto end = wanted.bytes.begin() + static_cast<std::ptrdiff_t>(result.same);
     const auto line = 1 + std::count(wanted.bytes.begin(), end, '\n');
-    fail(placeOf(path, static_cast<std::uint64_t>(line)),
-         "does not hold what was written; is the disk in order?");
+    throw OutputStop{{path, static_cast<std::uint64_t>(line), 0, "",
+                      "does not hold what was written; is the disk in order?"}};
   }
   if (result.same != wanted.bytes.size()) {
-    fail(path, "was not written completely: it has " + std::to_string(result.same) + " of " +
-                   counted(wanted.bytes.size(), "byte") +
-                   "; is there space left on the file system?");
+    stopOutput(path, "was not written completely: it has " + std::to_string(result.same) + " of " +
+                         std::to_string(wanted.bytes.size()) +
+                         (wanted.bytes.size() == 1 ? " byte" : " bytes") +
+                         "; is there space left on the file system?");
   }
 }
 
-}  // namespace
-
-void verifyTexts(const Directory& directory, const std::vector<OutputText>& texts,
-                 const std::string& folder) {
+// What is in this folder of the output.
+void verifyFolder(const Directory& directory, const std::vector<OutputText>& texts,
+                  const std::string& folder) {
   std::set<std::string> expected;
   for (const OutputText& text : texts) {
     if (text.folder == folder) {
@@ -88,14 +87,26 @@ void verifyTexts(const Directory& directory, const std::vector<OutputText>& text
   const std::vector<std::string> wanted(expected.begin(), expected.end());
   std::vector<std::string> names;
   if (!directory.list(&names)) {
-    fail(directory.path(), "cannot be read back: " + systemError(errno));
+    stopOutput(directory.path(), "cannot be read back: " + textOfError(errno));
   }
   if (names != wanted) {
-    fail(directory.path(), "holds other files than those that were written");
+    stopOutput(directory.path(), "holds other files than those that were written");
   }
 }
 
-void writeTexts(const std::vector<OutputText>& texts, OutputDirectory* output) {
+}  // namespace
+
+void verifyAllTexts(const OutputWork& output, const std::vector<OutputText>& texts) {
+  std::set<std::string> folders = {""};
+  for (const OutputText& text : texts) {
+    folders.insert(text.folder);
+  }
+  for (const std::string& folder : folders) {
+    verifyFolder(output.folder(folder), texts, folder);
+  }
+}
+
+void writeTexts(const std::vector<OutputText>& texts, OutputWork* output) {
   output->create();
   std::set<std::string> folders;
   for (const OutputText& text : texts) {
@@ -105,8 +116,7 @@ void writeTexts(const std::vector<OutputText>& texts, OutputDirectory* output) {
     output->write(text);
   }
   output->sync();
-  folders.insert("");
-  for (const std::string& folder : folders) {
-    verifyTexts(output->folder(folder), texts, folder);
-  }
+  verifyAllTexts(*output, texts);
 }
+
+}  // namespace migration
