@@ -12,6 +12,7 @@ import subprocess
 import time
 
 QUICK = 0.15  # seconds up to which a test belongs to the first step of its program
+A_MOMENT = 1  # seconds up to which a test counts with --quick
 MEMORY = 6 << 30
 
 # Tests to run at once. `program` is what they are built into, "" for all of the build.
@@ -109,26 +110,36 @@ class Copy:
 
     # ---- The tests ----
 
-    def measured_steps(self, without, is_whole):
+    def measured_steps(self, without, is_whole, is_quick):
         """As steps(), kept on disk for as long as the tests are the same."""
-        digest = hashlib.sha1(repr((without, is_whole)).encode())
+        digest = hashlib.sha1(repr((without, is_whole, is_quick)).encode())
         for folder, _, files in sorted(os.walk(os.path.join(self.tree, 'tests'))):
             for file in sorted(files):
                 with open(os.path.join(folder, file), 'rb') as data:
                     digest.update(data.read())
         kept = os.path.join(self.place, f'steps-{digest.hexdigest()[:10]}.json')
         if not os.path.exists(kept):
-            measured = self.steps(without, is_whole)
+            measured = self.steps(without, is_whole and not is_quick, is_quick)
             with open(kept, 'w', encoding='utf-8') as out:
                 json.dump(measured, out)
         with open(kept, encoding='utf-8') as text:
             steps, failing = json.load(text)
         return [Step(*step) for step in steps], failing
 
-    def steps(self, without, is_whole):
+    def as_in(self, other, steps):
+        """The steps of another copy as steps of this one."""
+        def here(text):
+            return text.replace(other.place + '/', self.place + '/')
+
+        return [step._replace(command=[here(word) for word in step.command],
+                              folder=here(step.folder),
+                              environment={k: here(v) for k, v in step.environment.items()})
+                for step in steps]
+
+    def steps(self, without, is_whole, is_quick):
         """All tests in steps, measured; the second value names those that fail without any change.
 
-        What needs the whole build counts only if that is to be had.
+        What needs the whole build counts only if that is to be had; slow tests only if all count.
         """
         listed = subprocess.run(['ctest', '--test-dir', self.build, '--show-only=json-v1'],
                                 env=self.environment, check=True, capture_output=True).stdout
@@ -151,33 +162,31 @@ class Copy:
                 others.append((not properties.get('FIXTURES_SETUP'), Step(
                     test['name'], own, command, folder, environment, 0)))
         for program, (path, folder, environment) in programs.items():
-            self.split(program, path, folder, environment, steps, failing)
+            self.split(program, path, folder, environment, is_quick, steps, failing)
         for _, step in sorted(others, key=lambda other: other[0]):
             begin = time.monotonic()
-            code, _ = self.run(step.command, step.folder, step.environment, 900)
+            code, _ = self.run(step.command, step.folder, step.environment, 10 if is_quick else 900)
+            if code is None and is_quick:
+                continue
             if code == 0:
                 steps.append(step._replace(seconds=time.monotonic() - begin))
             else:
                 failing.append(step.name)
         return steps, failing
 
-    def split(self, program, path, folder, environment, steps, failing):
-        report = os.path.join(self.place, 'report.json')
-        if os.path.exists(report):
-            os.remove(report)
-        self.run([path, '--gtest_output=json:' + report], folder, environment, 1800)
-        if not os.path.exists(report):
+    def split(self, program, path, folder, environment, is_quick, steps, failing):
+        _, output = self.run([path], folder, environment, 60 if is_quick else 1800)
+        quick, slow, bad = [], [], []
+        for result, name, time in re.findall(
+                r'^\[ +(OK|FAILED) +\] ([\w/.]+).* \((\d+) ms\)$', output, re.M):
+            seconds = int(time) / 1000
+            (bad if result == 'FAILED' else quick if seconds <= QUICK else slow).append(
+                (name, seconds))
+        if is_quick:
+            slow = [(name, seconds) for name, seconds in slow if seconds <= A_MOMENT]
+        if not quick + slow + bad:
             failing.append(program)
             return
-        with open(report, encoding='utf-8') as text:
-            suites = json.load(text)['testsuites']
-        quick, slow, bad = [], [], []
-        for suite in suites:
-            for test in suite['testsuite']:
-                name = suite['name'] + '.' + test['name']
-                seconds = float(test['time'].rstrip('s'))
-                (bad if test.get('failures') else quick if seconds <= QUICK else slow).append(
-                    (name, seconds))
         failing += [program + ' ' + name for name, _ in bad]
         name = os.path.basename(program)
 
@@ -188,7 +197,9 @@ class Copy:
                               folder, environment, sum(seconds for _, seconds in tests)))
 
         if quick:
-            step(name, '-' + ':'.join(test for test, _ in slow + bad), quick)
+            # Of a run that was cut off the others are not known.
+            step(name, ':'.join(test for test, _ in quick) if is_quick else
+                 '-' + ':'.join(test for test, _ in slow + bad), quick)
         if slow:
             step(name + ', slow ones', ':'.join(test for test, _ in slow), slow)
 

@@ -166,7 +166,5 @@ std::string summaryOf(const MigrationPlan& plan, const std::vector<migration::Na
   if (!isInLibraryLayout) {
     return tableOf(plan, *plan.result);
   }
-  migration::Failures failures;
-  return tableOf(
-      plan, Installation::fromTexts("result", result, migration::ReadLimits::none(), &failures));
+  return tableOf(plan, Installation::overTexts("result", result));
 }

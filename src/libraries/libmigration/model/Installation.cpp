@@ -36,6 +36,31 @@ Installation& Installation::operator=(Installation&&) noexcept = default;
 
 Installation::~Installation() = default;
 
+template <typename Texts, typename SourceOf>
+void Installation::Content::addTexts(Texts* texts, const SourceOf& sourceOf) {
+  files.reserve(kSchemaFiles.size());
+  for (const NamedText& text : *texts) {
+    if (schemaFileNumber(text.name) == kSchemaFiles.size() && beginsLikeASchemaFile(text.name)) {
+      otherFiles.push_back(text.name);
+    }
+  }
+  std::sort(otherFiles.begin(), otherFiles.end());
+  for (const char* const name : kSchemaFiles) {
+    const auto text = std::find_if(texts->begin(), texts->end(),
+                                   [name](const NamedText& each) { return each.name == name; });
+    if (text == texts->end()) {
+      continue;
+    }
+    present.emplace_back(name);
+    std::unique_ptr<Source> source =
+        sourceOf(directory.empty() ? name : directory + "/" + name, &*text);
+    if (source != nullptr) {
+      addFile(name, std::move(source));
+      files.back().mode = text->mode;
+    }
+  }
+}
+
 Installation Installation::fromDirectory(const std::string& directory, const ReadLimits& limits,
                                          Failures* failures) {
   auto content = std::make_unique<Content>();
@@ -65,7 +90,7 @@ Installation Installation::fromDirectory(const std::string& directory, const Rea
     std::string unread = input.read(name, rest, &text);
     if (unread.empty()) {
       rest.used += text.bytes.size();
-      content->addFile(name, std::move(path), std::move(text.bytes));
+      content->addFile(name, std::make_unique<Source>(std::move(path), std::move(text.bytes)));
       content->files.back().mode = text.mode;
     } else {
       failures->push_back({std::move(path), 0, 0, "", std::move(unread)});
@@ -84,31 +109,26 @@ Installation Installation::fromTexts(const std::string& directory, std::vector<N
   auto content = std::make_unique<Content>();
   content->directory = directory;
   ReadLimits rest = limits;
-  content->files.reserve(kSchemaFiles.size());
-  for (NamedText& text : texts) {
-    if (schemaFileNumber(text.name) == kSchemaFiles.size()) {
-      if (beginsLikeASchemaFile(text.name)) {
-        content->otherFiles.push_back(text.name);
-      }
-    }
-  }
-  for (const char* const name : kSchemaFiles) {
-    const auto text = std::find_if(texts.begin(), texts.end(),
-                                   [name](const NamedText& each) { return each.name == name; });
-    if (text == texts.end()) {
-      continue;
-    }
-    content->present.emplace_back(name);
-    std::string path = directory.empty() ? name : directory + "/" + name;
+  content->addTexts(&texts, [&](std::string path, NamedText* text) {
+    std::unique_ptr<Source> source;
     if (text->bytes.size() > rest.room()) {
       failures->push_back({std::move(path), 0, 0, "", rest.exceeded()});
-      continue;
+    } else {
+      rest.used += text->bytes.size();
+      source = std::make_unique<Source>(std::move(path), std::move(text->bytes));
     }
-    rest.used += text->bytes.size();
-    content->addFile(name, std::move(path), std::move(text->bytes));
-    content->files.back().mode = text->mode;
-  }
-  std::sort(content->otherFiles.begin(), content->otherFiles.end());
+    return source;
+  });
+  return Installation(std::move(content));
+}
+
+Installation Installation::overTexts(const std::string& directory,
+                                     const std::vector<NamedText>& texts) {
+  auto content = std::make_unique<Content>();
+  content->directory = directory;
+  content->addTexts(&texts, [](std::string path, const NamedText* text) {
+    return std::make_unique<Source>(std::move(path), Source::Borrowed{text->bytes});
+  });
   return Installation(std::move(content));
 }
 

@@ -85,6 +85,9 @@ class Installation {
   // The same from texts; `directory` only names it.
   static Installation fromTexts(const std::string& directory, std::vector<NamedText> texts,
                                 const ReadLimits& limits, Failures* failures);
+  // The same over texts that stay in place, unchanged, for as long as the installation: they are
+  // not copied.
+  static Installation overTexts(const std::string& directory, const std::vector<NamedText>& texts);
   Installation(Installation&&) noexcept;
   Installation& operator=(Installation&&) noexcept;
   ~Installation();

@@ -38,10 +38,10 @@ bool isKeptAsWritten(const Entry& entry) {
 
 }  // namespace
 
-void Installation::Content::addFile(const char* name, std::string path, std::string bytes) {
+void Installation::Content::addFile(const char* name, std::unique_ptr<Source> source) {
   SchemaFile& file = files.emplace_back();
   file.name = name;
-  file.source = std::make_unique<Source>(std::move(path), std::move(bytes));
+  file.source = std::move(source);
   file.written = std::make_unique<WrittenFile>(*file.source);
   file.kept = std::make_unique<KeptFile>(*file.source);
 }

@@ -42,7 +42,11 @@ struct Installation::Content {
   Written written;
   References references;
 
-  void addFile(const char* name, std::string path, std::string bytes);
+  void addFile(const char* name, std::unique_ptr<Source> source);
+  // The texts that schema files have; `sourceOf` makes the source of one, null when it must not be
+  // read.
+  template <typename Texts, typename SourceOf>
+  void addTexts(Texts* texts, const SourceOf& sourceOf);
   void takeDefinitions(const SchemaFile& file);
   void makeIndexes();
   void indexKind(Kind kind);

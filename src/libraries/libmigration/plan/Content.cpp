@@ -24,7 +24,7 @@ void setFlag(Content* fields, Aspect aspect, bool isSet) {
 
 void setText(Content* fields, Aspect aspect, const std::string& text) {
   if (!text.empty()) {
-    (*fields)[aspect] = {text};
+    (*fields)[aspect].assign(1, text);
   }
 }
 

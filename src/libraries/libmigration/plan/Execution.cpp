@@ -56,8 +56,10 @@ std::string readText(const std::string& path) {
   if (!in.is_open()) {
     stopSystem(path, "a private copy cannot be read");
   }
-  std::string bytes((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-  if (in.bad()) {
+  in.seekg(0, std::ios::end);
+  std::string bytes(static_cast<std::size_t>(std::max<std::streamoff>(in.tellg(), 0)), '\0');
+  in.seekg(0);
+  if (!in.read(bytes.data(), static_cast<std::streamsize>(bytes.size()))) {
     stopSystem(path, "a private copy cannot be read");
   }
   return bytes;
@@ -86,7 +88,7 @@ std::string listOf(const ThreeWay& threeWay, Outcome outcome) {
 
 // The library must come to the end of what it is given.
 void guard(const std::string& folder, const NamedText& text) {
-  const Source source(text.name, text.bytes);
+  const Source source(text.name, Source::Borrowed{text.bytes});
   const KeptFile kept(source);
   if (kept.ending() != ReadingEnd::kWhole) {
     const Place place = source.placeOf(kept.endOffset());
@@ -114,37 +116,40 @@ std::unique_ptr<SchemaManager> readAll(const std::string& folder,
 
 bool isConfigFile(const std::string& name) { return name.rfind("V3.config.", 0) == 0; }
 
-// What a manager writes of the seven files that have a set.
+// What a manager writes of one file.
+std::string write(SchemaManager* manager, const std::string& folder, const std::string& file) {
+  const std::string path = folder + "/" + file;
+  if (manager->writeFile(folder, file) != 0) {
+    stopWriting(path, "cannot be created");
+  }
+  std::string bytes = readText(path);
+  // The library does not notice that a write fails.
+  if (!bytes.empty() && bytes.back() != '\n') {
+    stopWriting(path, "was not written completely");
+  }
+  return bytes;
+}
+
+// The seven files that have a set.
 std::vector<NamedText> writeAll(SchemaManager* manager, const std::string& folder) {
   std::vector<NamedText> texts;
   for (const char* const file : kSchemaFiles) {
-    if (isConfigFile(file)) {
-      continue;
-    }
-    const std::string path = folder + "/" + file;
-    if (manager->writeFile(folder, file) != 0) {
-      stopWriting(path, "cannot be created");
-    }
-    texts.push_back({file, readText(path)});
-    // The library does not notice that a write fails.
-    const std::string& bytes = texts.back().bytes;
-    if (!bytes.empty() && bytes.back() != '\n') {
-      stopWriting(path, "was not written completely");
+    if (!isConfigFile(file)) {
+      texts.push_back({file, write(manager, folder, file)});
     }
   }
   return texts;
 }
 
 // The lines below the header, which holds the time.
-std::string_view definitionsOf(const NamedText& text) {
-  const std::string_view bytes = text.bytes;
+std::string_view definitionsOf(std::string_view bytes) {
   const std::size_t end = bytes.find('\n');
   return end == std::string_view::npos ? bytes : bytes.substr(end + 1);
 }
 
 std::vector<NamedText> mergeByLibrary(const ThreeWayRequest& request, const ThreeWay& threeWay,
                                       const std::string& directory) {
-  const StagedTexts staged = stage(request, threeWay);
+  StagedTexts staged = stage(request, threeWay);
   const std::string oldFolder = directory + "/old";
   const std::string newFolder = directory + "/new";
   writeTexts(oldFolder, staged.old);
@@ -153,6 +158,7 @@ std::vector<NamedText> mergeByLibrary(const ThreeWayRequest& request, const Thre
   writeText(oldFolder + "/withdrawn", listOf(threeWay, Outcome::kWithdrawn));
   std::unique_ptr<SchemaManager> old = readAll(oldFolder, staged.old);
   std::unique_ptr<SchemaManager> latest = readAll(newFolder, staged.latest);
+  staged = {};
   if (old->modifySchema(oldFolder + "/withdrawn") != 0 ||
       old->readExcludedOids(oldFolder + "/excluded") != 0) {
     stop(oldFolder, "the library cannot read the lists");
@@ -172,11 +178,10 @@ void proveAlike(const std::vector<NamedText>& merged, const std::vector<NamedTex
   const std::string folder = directory + "/kept";
   writeTexts(folder, inNewsLayout);
   const std::unique_ptr<SchemaManager> kept = readAll(folder, inNewsLayout);
-  const std::vector<NamedText> written = writeAll(kept.get(), directory + "/kept-written");
-  for (std::size_t file = 0; file < merged.size(); ++file) {
-    if (definitionsOf(merged[file]) != definitionsOf(written[file])) {
-      stop(merged[file].name,
-           "what the library's merge comes to is not what the planned files hold");
+  for (const NamedText& file : merged) {
+    const std::string written = write(kept.get(), directory + "/kept-written", file.name);
+    if (definitionsOf(file.bytes) != definitionsOf(written)) {
+      stop(file.name, "what the library's merge comes to is not what the planned files hold");
     }
   }
 }
@@ -205,13 +210,17 @@ bool isKept(const KeptFile& kept, const Content& wanted) {
 bool survivesWriting(const Content& content) {
   constexpr std::array<const char*, 3> kKeywords = {
       "attributetypes=", "objectclasses=", "ORVAttributetypes="};
-  const Source planned("result",
-                       kKeywords[static_cast<std::size_t>(content.kind)] + textOf(content) + "\n");
-  const KeptFile kept(planned);
-  if (!isKept(kept, content)) {
-    return false;
+  std::string line;
+  {
+    const Source planned(
+        "result", kKeywords[static_cast<std::size_t>(content.kind)] + textOf(content) + "\n");
+    const KeptFile kept(planned);
+    if (!isKept(kept, content)) {
+      return false;
+    }
+    line = writtenByLibrary(kept.definitions().front());
   }
-  const Source written("result", writtenByLibrary(kept.definitions().front()));
+  const Source written("result", std::move(line));
   return isKept(KeptFile(written), content);
 }
 
@@ -355,12 +364,7 @@ class Comparing {
 };
 
 Deviations compareWithPlan(const ThreeWay& threeWay, const std::vector<NamedText>& texts) {
-  Failures failures;
-  const Installation result =
-      Installation::fromTexts("result", texts, ReadLimits::none(), &failures);
-  Deviations deviations = Comparing(threeWay, result).run();
-  deviations.ofPlan.insert(deviations.ofPlan.begin(), failures.begin(), failures.end());
-  return deviations;
+  return Comparing(threeWay, Installation::overTexts("result", texts)).run();
 }
 
 Failures together(Deviations deviations) {
@@ -384,8 +388,8 @@ Execution execute(const ThreeWayRequest& request, const ThreeWay& threeWay,
     return execution;
   }
   try {
-    execution.inNewsLayout = inNewsLayout(request, threeWay);
     execution.inLibraryLayout = mergeByLibrary(request, threeWay, directory);
+    execution.inNewsLayout = inNewsLayout(request, threeWay);
     proveAlike(execution.inLibraryLayout, execution.inNewsLayout, directory);
     for (const SchemaFile& file : request.latest->files()) {
       if (isConfigFile(file.name)) {

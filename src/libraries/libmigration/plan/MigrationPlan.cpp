@@ -24,9 +24,9 @@ namespace migration {
 namespace {
 
 void checkResult(MigrationPlan* plan) {
+  plan->result.reset();
   plan->resultTexts = inNewsLayout(plan->request, plan->threeWay);
-  plan->result =
-      Installation::fromTexts("result", plan->resultTexts, ReadLimits::none(), &plan->refusals);
+  plan->result = Installation::overTexts("result", plan->resultTexts);
   plan->newInResult = newInResult(*plan);
   for (const Finding& finding : plan->newInResult) {
     plan->refusals.push_back(

@@ -83,7 +83,7 @@ struct MigrationPlan {
 
   // The result in NEW's layout, as it stands with what is undecided left at NEW's.
   std::vector<NamedText> resultTexts;
-  std::optional<Installation> result;
+  std::optional<Installation> result;  // over these texts
 };
 
 // Works the plan out. Nothing is written.

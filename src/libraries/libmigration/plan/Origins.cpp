@@ -98,9 +98,7 @@ std::string cell(std::string_view text) {
 }  // namespace
 
 std::vector<Origin> originsOf(const MigrationPlan& plan, const std::vector<NamedText>& outputs) {
-  Failures failures;
-  const Installation installation =
-      Installation::fromTexts("output", outputs, ReadLimits::none(), &failures);
+  const Installation installation = Installation::overTexts("output", outputs);
   Tracer tracer(plan);
   std::vector<Origin> origins;
   origins.reserve(installation.entries().size());

@@ -24,8 +24,7 @@ std::string idOf(const Entry& entry) {
 }
 
 Installation installationOf(const PlannedFiles& planned) {
-  Failures failures;
-  return Installation::fromTexts("planned", planned.texts, ReadLimits::none(), &failures);
+  return Installation::overTexts("planned", planned.texts);
 }
 
 // The definitions of one kind and OID, as planned and as found; mostly one each.

@@ -169,12 +169,12 @@ class Places {
   Repeats m_repeats;
 };
 
-std::vector<NamedText> textsOf(const std::map<std::string, std::string>& byFile) {
+std::vector<NamedText> textsOf(std::map<std::string, std::string> byFile) {
   std::vector<NamedText> texts;
   for (const char* const name : kSchemaFiles) {
     const auto found = byFile.find(name);
     if (found != byFile.end()) {
-      texts.push_back({name, found->second});
+      texts.push_back({name, std::move(found->second)});
     }
   }
   return texts;
@@ -207,18 +207,13 @@ class Additions {
     }
   }
 
-  // The lines for one file, with those above them, in their order; empty when nothing is added.
-  std::string linesFor(const std::string& file) {
-    const auto found = m_byFile.find(file);
-    if (found == m_byFile.end()) {
-      return "";
-    }
+  // Adds the lines for one file of files(), with those above them, in their order.
+  void addTo(const std::string& file, std::string* text) {
     m_areReturns = m_endsWithReturns[file];
-    std::string lines = withLineEnds(std::string(kHeading), m_areReturns);
-    for (const std::size_t row : found->second) {
-      addWithSuperiors(row, file, &lines);
+    text->append(withLineEnds(std::string(kHeading), m_areReturns));
+    for (const std::size_t row : m_byFile.at(file)) {
+      addWithSuperiors(row, file, text);
     }
-    return lines;
   }
 
   std::vector<std::string> files() const {
@@ -270,9 +265,12 @@ class Additions {
   }
 
   void addLine(const Verdict& row, std::string* lines) const {
-    const std::string line = lineOf(row.kind(), withLineEnds(row.kind(), row.text, m_areReturns));
-    lines->append(withLineEnds(commentsOf(row), m_areReturns))
-        .append(line, 0, line.size() - 1)
+    const std::string comments = withLineEnds(commentsOf(row), m_areReturns);
+    const std::string keyword = lineOf(row.kind(), "");
+    lines->reserve(lines->size() + comments.size() + keyword.size() + row.text.size() + 2);
+    lines->append(comments)
+        .append(keyword, 0, keyword.size() - 1)
+        .append(withLineEnds(row.kind(), row.text, m_areReturns))
         .append(m_areReturns ? "\r\n" : "\n");
   }
 
@@ -313,7 +311,7 @@ StagedTexts stage(const ThreeWayRequest& request, const ThreeWay& threeWay) {
   for (const SchemaFile& file : request.latest->files()) {
     latest[file.name] = editedText(file, edits);
   }
-  return {textsOf(old), textsOf(latest)};
+  return {textsOf(std::move(old)), textsOf(std::move(latest))};
 }
 
 std::vector<NamedText> inNewsLayout(const ThreeWayRequest& request, const ThreeWay& threeWay) {
@@ -346,9 +344,9 @@ std::vector<NamedText> inNewsLayout(const ThreeWayRequest& request, const ThreeW
     if (!text.empty() && text.back() != '\n') {
       text += endsLinesWithReturns(text) ? "\r\n" : "\n";
     }
-    text += additions.linesFor(file);
+    additions.addTo(file, &text);
   }
-  return textsOf(texts);
+  return textsOf(std::move(texts));
 }
 
 }  // namespace migration

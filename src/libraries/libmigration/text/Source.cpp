@@ -13,7 +13,16 @@ constexpr std::size_t kStretch = 1024;
 }  // namespace
 
 Source::Source(std::string path, std::string bytes)
-    : m_path(std::move(path)), m_bytes(std::move(bytes)) {
+    : m_path(std::move(path)), m_owned(std::move(bytes)), m_bytes(m_owned) {
+  divide();
+}
+
+Source::Source(std::string path, Borrowed borrowed)
+    : m_path(std::move(path)), m_bytes(borrowed.bytes) {
+  divide();
+}
+
+void Source::divide() {
   m_stretches.reserve(m_bytes.size() / kStretch + 1);
   Stretch next{1, 0};
   for (std::size_t begin = 0;; begin += kStretch) {
@@ -49,7 +58,7 @@ std::string_view Source::lineAt(std::size_t offset) const {
   const std::size_t inside = std::min(offset, m_bytes.size());
   const std::size_t start = inside - (placeOf(inside).column - 1);
   const std::size_t end = m_bytes.find('\n', start);
-  return std::string_view(m_bytes).substr(start, end == std::string::npos ? end : end - start);
+  return m_bytes.substr(start, end == std::string_view::npos ? end : end - start);
 }
 
 std::string_view Source::line(std::uint64_t number) const {
@@ -64,7 +73,7 @@ std::string_view Source::line(std::uint64_t number) const {
   std::size_t start = from.lineStart;
   for (std::uint64_t line = from.line; line < number; ++line) {
     const std::size_t end = m_bytes.find('\n', start);
-    if (end == std::string::npos) {
+    if (end == std::string_view::npos) {
       return {};
     }
     start = end + 1;

@@ -27,6 +27,13 @@ class Source {
  public:
   // `path` is the name that messages show, `bytes` the whole content. No file is touched.
   Source(std::string path, std::string bytes);
+
+  // Over bytes that belong to the caller, and stay in place, unchanged, for as long as the source.
+  struct Borrowed {
+    std::string_view bytes;
+  };
+  Source(std::string path, Borrowed borrowed);
+
   Source(const Source&) = delete;
   Source& operator=(const Source&) = delete;
 
@@ -44,8 +51,11 @@ class Source {
   std::string_view line(std::uint64_t number) const;
 
  private:
+  void divide();
+
   std::string m_path;
-  std::string m_bytes;
+  std::string m_owned;
+  std::string_view m_bytes;
   // Where each stretch of bytes begins: a file of line ends alone must not take more room than its
   // bytes do.
   struct Stretch {
