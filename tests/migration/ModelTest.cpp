@@ -290,6 +290,20 @@ TEST(NearestNames, AreTheMostAlike) {
   EXPECT_EQ(std::vector<std::string>(), nearestNames(schema, "mail"));
 }
 
+TEST(Compare, DefinitionsOfTwoKindsAreNeverEqual) {
+  const Installation schema =
+      support::installationOf({{"V3.user.at", "attributetypes=( 1.1 NAME 'a' DESC 'd' )\n"},
+                               {"V3.user.oc", "objectclasses=( 1.1 NAME 'a' DESC 'd' )\n"},
+                               {"V3.orv.at", "ORVAttributetypes=( 1.1 )\n"}},
+                              "", "old");
+  for (const Entry& left : schema.entries()) {
+    for (const Entry& right : schema.entries()) {
+      EXPECT_EQ(&left == &right, migration::areEqual(*left.kept, *right.kept))
+          << placeOf(&left) << " " << placeOf(&right);
+    }
+  }
+}
+
 TEST(Compare, PairsByOidBeforeName) {
   const Installation left = support::installationOf(
       {{"V3.user.at",

@@ -231,6 +231,22 @@ TEST_P(Formats, SayTheSame) {
     expectInOrder(inPage(definition), textOf(definitionIn(page, i, "article")));
   }
   EXPECT_GT(differences, 20U);
+  std::map<std::string, std::map<std::string, std::size_t>> words;
+  for (const Json& definition : document["definitions"]) {
+    for (const char* const by : {"class", "outcome", "risk"}) {
+      ++words[by][definition[by]];
+    }
+  }
+  // Of those that do not differ diff tells the number alone.
+  const std::size_t all = document["counts"]["definitions"];
+  if (const std::size_t same = all - document["definitions"].size(); same != 0) {
+    words["class"]["same"] += same;
+    words["outcome"]["same"] += same;
+    words["risk"]["none"] += same;
+  }
+  nlohmann::json counts = words;
+  counts["definitions"] = all;
+  EXPECT_EQ(counts, nlohmann::json::parse(document["counts"].dump()));
   EXPECT_NE(std::string::npos,
             text.find(std::to_string(differences) + " differences in " +
                       std::to_string(document["counts"]["definitions"].get<std::size_t>()) +

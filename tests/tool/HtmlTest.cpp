@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "Files.h"
+#include "HtmlPage.h"
 #include "HtmlReport.h"
 #include "ToolRun.h"
 
@@ -199,6 +200,48 @@ TEST_F(Html, WhatNobodySeesIsShown) {
       "\x1b[31m \x7f \xe2\x80\xa8 \xe2\x80\xae \xc2\x9b \xc3\xa9";
   EXPECT_TRUE(
       has(renderPlanHtml(document.dump()), "\\u001b[31m \\u007f \\u2028 \\u202e \\u009b \xc3\xa9"));
+}
+
+std::string utf8Of(unsigned character) {
+  std::string text;
+  const auto follow = [&](unsigned shift) {
+    text += static_cast<char>(0x80U | ((character >> shift) & 0x3fU));
+  };
+  if (character < 0x80) {
+    text += static_cast<char>(character);
+  } else if (character < 0x800) {
+    text += static_cast<char>(0xc0U | (character >> 6U));
+    follow(0);
+  } else if (character < 0x10000) {
+    text += static_cast<char>(0xe0U | (character >> 12U));
+    follow(6);
+    follow(0);
+  } else {
+    text += static_cast<char>(0xf0U | (character >> 18U));
+    follow(12);
+    follow(6);
+    follow(0);
+  }
+  return text;
+}
+
+// Every character from one whose neighbours are seen to another.
+TEST(HtmlText, EveryCharacterThatNobodySeesIsShown) {
+  const std::vector<std::pair<unsigned, unsigned>> unseen = {
+      {0, 0x1f},        {0x7f, 0x9f},     {0xad, 0xad},     {0x61c, 0x61c},
+      {0x180e, 0x180e}, {0x200b, 0x200f}, {0x2028, 0x202e}, {0x2060, 0x206f},
+      {0xfe00, 0xfe0f}, {0xfeff, 0xfeff}, {0xfff9, 0xfffb}, {0xe0000, 0xe0fff}};
+  std::string shown;
+  for (const auto& [first, last] : unseen) {
+    for (unsigned character = first == 0 ? 0 : first - 1; character <= last + 1; ++character) {
+      const std::string text = utf8Of(character);
+      const bool isSeen = character < first || character > last;
+      shown += (html::visible(text) == text) == isSeen ? "" : std::to_string(character) + " ";
+    }
+  }
+  EXPECT_EQ("", shown);
+  EXPECT_EQ("a\\u200b\\u202eb\\ufe0f\\ue0001", html::visible("a\xe2\x80\x8b\xe2\x80\xae"
+                                                             "b\xef\xb8\x8f\xf3\xa0\x80\x81"));
 }
 
 TEST_F(Html, NoTextOfADefinitionIsMoreThanText) {
