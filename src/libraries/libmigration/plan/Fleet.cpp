@@ -133,18 +133,26 @@ class FleetReader::Collection {
     added.path = path;
     added.release = releaseOf(*plan);
     added.isReady = plan->isReady;
-    added.definitions = plan->rows.size();
+    added.definitions = plan->rows.size() + plan->untouched.count();
     added.refusals = plan->refusals;
     ++m_fleet.releases[added.release].installations;
+    const bool hasBase = !plan->base.empty();
     std::set<std::string> questions;  // a plan may have the same definition twice
     for (FleetPlanRow& row : plan->rows) {
       added.undecided += row.isUndecided() ? 1 : 0;
-      count(here, added.release, !plan->base.empty(), row);
+      count(here, added.release, standingOf(row, hasBase), hasBase, row);
       if (row.isQuestion && questions.insert(questionKeyOf(row)).second && isAskedFor(row)) {
         ask(here, &row);
       }
     }
     added.questions = questions.size();
+    FleetPlanRow untouched;
+    for (std::size_t at = 0; at < plan->untouched.count(); ++at) {
+      plan->untouched.copy(at, &untouched);
+      plan->followAttribute(&untouched);
+      count(here, added.release, untouched.side == 'r' ? Standing::kAbsent : Standing::kUnchanged,
+            hasBase, untouched);
+    }
     m_fleet.installations.push_back(std::move(added));
   }
 
@@ -196,21 +204,25 @@ class FleetReader::Collection {
 
   // The place of a definition; one that a plan has twice counts twice.
   Counted& countedOf(std::size_t here, std::size_t release, const FleetPlanRow& row) {
-    std::string key = std::to_string(release) + " " + row.kind + " " + row.side + " " +
-                      folded(row.commonOid.empty() ? row.commonName : row.commonOid);
+    const std::string& own = row.commonOid.empty() ? row.commonName : row.commonOid;
+    m_key.assign(std::to_string(release)).append(1, ' ').append(row.kind).append(1, ' ');
+    m_key.append(1, row.side);
+    for (const char c : own) {
+      m_key += c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+    }
     for (;;) {
-      Counted& counted = m_counted[key];
+      Counted& counted = m_counted[m_key];
       if (counted.lastPlan != here) {
         counted.lastPlan = here;
         return counted;
       }
-      key += " again";
+      m_key += " again";
     }
   }
 
-  void count(std::size_t here, std::size_t release, bool hasBase, const FleetPlanRow& row) {
+  void count(std::size_t here, std::size_t release, Standing standing, bool hasBase,
+             const FleetPlanRow& row) {
     Counted& counted = countedOf(here, release, row);
-    const Standing standing = standingOf(row, hasBase);
     counted.has += hasIt(standing) ? 1 : 0;
     counted.unchanged += standing == Standing::kUnchanged ? 1 : 0;
     counted.undecided += row.isUndecided() ? 1 : 0;
@@ -349,6 +361,7 @@ class FleetReader::Collection {
   Fleet m_fleet;
   std::vector<std::pair<std::string, std::string>> m_filesOfFirst;
   std::unordered_map<std::string, std::size_t> m_releases;
+  std::string m_key;  // whose room is used again and again
   std::unordered_map<std::string, Counted> m_counted;
   std::unordered_map<std::string, std::size_t> m_groups;
   std::unordered_set<std::string> m_ways;

@@ -43,7 +43,7 @@ enum class Shape : std::uint8_t { kNull, kFlag, kNumber, kText, kObject, kArray 
 // What stands at a place of the document.
 struct Token {
   Shape shape = Shape::kNull;
-  std::string* text = nullptr;  // of a text; it may be taken
+  const std::string* text = nullptr;  // of a text
   bool flag = false;
   std::uint64_t number = 0;
 };
@@ -65,13 +65,6 @@ constexpr std::array<std::string_view, 3> kKinds = {"attribute-type", "object-cl
 template <std::size_t kCount>
 std::size_t placeIn(const std::array<std::string_view, kCount>& names, std::string_view name) {
   return static_cast<std::size_t>(std::find(names.begin(), names.end(), name) - names.begin());
-}
-
-// What nobody but the release touched.
-bool isUntouched(const FleetPlanRow& row) {
-  return !row.isUndecided() &&
-         (row.change == "changed-by-release" || row.change == "added-by-release" ||
-          (row.change == "same" && row.isInBase && row.isInOld && row.clauses.empty()));
 }
 
 // "'cn'" without its quotes.
@@ -213,7 +206,7 @@ class PlanReading {
     if (token.shape != Shape::kText) {
       return fail(kNoText);
     }
-    *text = std::move(*token.text);
+    *text = *token.text;  // which has room already, mostly
     return true;
   }
   // What one of the sides may not have.
@@ -270,6 +263,7 @@ class PlanReading {
                     "is another program");
     }
     if (isIn("options")) {
+      m_isWithoutBase = m_isWithoutBase || (keyAt(2) == "base" && token.shape == Shape::kNull);
       return keyAt(2) == "base" ? takeTextOrNull(token, &m_plan.base)
              : keyAt(2) == "to" ? takeText(token, &m_plan.latest)
                                 : true;
@@ -280,8 +274,7 @@ class PlanReading {
       m_plan.files.emplace_back();
       return expect(token.shape == Shape::kObject, kNoObject);
     } else if (isIn("definitions")) {
-      m_plan.rows.emplace_back();
-      m_seenMembers = 0;
+      beginRow();
       return expect(token.shape == Shape::kObject, kNoObject);
     }
     return true;
@@ -304,7 +297,7 @@ class PlanReading {
         &FleetPlanRow::kind,       &FleetPlanRow::oid,     &FleetPlanRow::name,
         &FleetPlanRow::change,     &FleetPlanRow::outcome, &FleetPlanRow::reason,
         &FleetPlanRow::fingerprint};
-    FleetPlanRow& row = m_plan.rows.back();
+    FleetPlanRow& row = m_row;
     if (m_member < kTexts.size()) {
       return takeText(token, &(row.*kTexts[m_member])) &&
              (m_member != 0 || expect(placeIn(kKinds, row.kind) != kKinds.size(), "is no kind"));
@@ -322,12 +315,12 @@ class PlanReading {
 
   // And what stands in it.
   bool lookInMember(const Token& token) {
-    FleetPlanRow& row = m_plan.rows.back();
+    FleetPlanRow& row = m_row;
     if (isAt("clauses")) {
       return lookInClauses(token, &row.clauses);
     }
     if (isAt("otherClauses")) {
-      return lookInValues(token, &row.values);
+      return lookInValues(token);
     }
     if (isAt("question")) {
       return lookInQuestion(token, &row);
@@ -358,15 +351,18 @@ class PlanReading {
                                 : true;
   }
 
-  bool lookInValues(const Token& token, std::vector<FleetValue>* values) {
+  bool lookInValues(const Token& token) {
     if (m_steps.size() == 4) {
-      values->emplace_back();
+      if (m_valueCount++ == m_row.values.size()) {
+        m_row.values.emplace_back();
+      }
       return expect(token.shape == Shape::kObject, kNoObject);
     }
     const std::string& member = keyAt(5);
+    FleetValue& value = m_row.values[m_valueCount - 1];
     return m_steps.size() != 5  ? true
-           : member == "clause" ? takeText(token, &values->back().first)
-           : member == "value"  ? takeText(token, &values->back().second)
+           : member == "clause" ? takeText(token, &value.first)
+           : member == "value"  ? takeText(token, &value.second)
                                 : true;
   }
 
@@ -387,29 +383,39 @@ class PlanReading {
     return !isClause || addText(token, &row->openClauses);
   }
 
+  // What is read of a row stands where the last one stood, unless that was kept.
+  void beginRow() {
+    m_seenMembers = 0;
+    m_valueCount = 0;
+    m_row.clauses.clear();
+    m_row.takes.clear();
+    m_row.openClauses.clear();
+    m_row.isInBase = m_row.isInOld = m_row.isInNew = false;
+    m_row.isQuestion = m_row.isByName = m_row.mayMove = false;
+  }
+
+  // What nobody but the release touched, whatever else the document says.
+  bool isUntouched() const {
+    const bool isSame = m_row.change == "same" && m_row.isInOld && m_row.clauses.empty() &&
+                        (m_row.isInBase || m_isWithoutBase);
+    return !m_row.isUndecided() &&
+           (isSame || m_row.change == "changed-by-release" || m_row.change == "added-by-release");
+  }
+
   bool finishRow() {
     if (!hasAll(kMembers, m_seenMembers)) {
       return false;
     }
-    FleetPlanRow& row = m_plan.rows.back();
-    // A document that does not tell its questions yet.
-    row.isQuestion = row.isUndecided() && (row.isQuestion || !m_hasQuestions);
-    if (isUntouched(row)) {
-      // Without BASE there is no such row but for what is the same in all clauses.
-      nameAlike(true, &row);
-      FleetPlanRow kept;
-      kept.kind = std::move(row.kind);
-      kept.change = std::move(row.change);
-      kept.oid = std::move(row.oid);
-      kept.name = std::move(row.name);
-      kept.commonOid = std::move(row.commonOid);
-      kept.commonName = std::move(row.commonName);
-      kept.side = row.side;
-      kept.isInBase = row.isInBase;
-      kept.isInOld = row.isInOld;
-      kept.isInNew = row.isInNew;
-      row = std::move(kept);
+    if (isUntouched()) {
+      nameAlike(!m_isWithoutBase, &m_row);
+      m_plan.untouched.add(m_row);
+      return true;
     }
+    // A document that does not tell its questions yet.
+    m_row.isQuestion = m_row.isUndecided() && (m_row.isQuestion || !m_hasQuestions);
+    m_row.values.resize(m_valueCount);
+    m_plan.rows.push_back(std::move(m_row));
+    m_row = FleetPlanRow();
     return true;
   }
 
@@ -421,28 +427,53 @@ class PlanReading {
   std::uint32_t m_seenSections = 0;
   std::uint32_t m_seenMembers = 0;
   bool m_hasQuestions = false;
+  bool m_isWithoutBase = false;  // that it has none is known
+  FleetPlanRow m_row;            // that is being read
+  std::size_t m_valueCount = 0;  // of its values that it has
 };
 
-// The OID of a vendor extension is no clause of it: it is that of its attribute type.
-void nameAll(bool hasBase, std::vector<FleetPlanRow>* rows) {
-  std::map<std::string, std::string> common;
-  for (FleetPlanRow& row : *rows) {
-    if (row.side == ' ') {
-      nameAlike(hasBase, &row);
-    }
+void nameAll(FleetPlan* plan) {
+  for (FleetPlanRow& row : plan->rows) {
+    nameAlike(!plan->base.empty(), &row);
     if (row.kind == "attribute-type" && row.oid != row.commonOid) {
-      common[row.oid] = row.commonOid;
+      plan->renumbered[row.oid] = row.commonOid;
     }
   }
-  for (FleetPlanRow& row : *rows) {
-    const auto found = row.kind == "vendor-extension" ? common.find(row.oid) : common.end();
-    if (found != common.end()) {
-      row.commonOid = found->second;
-    }
+  for (FleetPlanRow& row : plan->rows) {
+    plan->followAttribute(&row);
   }
 }
 
 }  // namespace
+
+void UntouchedRows::add(const FleetPlanRow& row) {
+  Row added;
+  added.begin = m_bytes.size();
+  added.lengths = {row.commonOid.size(), row.commonName.size(), row.oid.size()};
+  added.kind = static_cast<std::uint8_t>(placeIn(kKinds, row.kind));
+  added.side = row.side;
+  m_bytes.append(row.commonOid).append(row.commonName).append(row.oid);
+  m_rows.push_back(added);
+}
+
+void UntouchedRows::copy(std::size_t at, FleetPlanRow* row) const {
+  const Row& kept = m_rows[at];
+  const auto& [common, name, own] = kept.lengths;
+  row->kind = kKinds[kept.kind];
+  row->side = kept.side;
+  row->commonOid.assign(m_bytes, kept.begin, common);
+  row->commonName.assign(m_bytes, kept.begin + common, name);
+  row->oid.assign(m_bytes, kept.begin + common + name, own);
+}
+
+void FleetPlan::followAttribute(FleetPlanRow* row) const {
+  const auto found = row->kind == "vendor-extension" && !renumbered.empty()
+                         ? renumbered.find(row->oid)
+                         : renumbered.end();
+  if (found != renumbered.end()) {
+    row->commonOid = found->second;
+  }
+}
 
 bool readFleetPlan(const Source& source, FleetPlan* plan, Failures* failures) {
   const std::string_view bytes = source.bytes();
@@ -450,7 +481,7 @@ bool readFleetPlan(const Source& source, FleetPlan* plan, Failures* failures) {
   PlanReading reading(plan);
   if (Json::sax_parse(CountingIterator(bytes.data(), &reached),
                       CountingIterator(bytes.data() + bytes.size(), &reached), &reading)) {
-    nameAll(!plan->base.empty(), &plan->rows);
+    nameAll(plan);
     return true;
   }
   // What is told is the last that was read.

@@ -3,7 +3,10 @@
 #ifndef LIBSCHEMA_MIGRATION_FLEET_PLAN_H
 #define LIBSCHEMA_MIGRATION_FLEET_PLAN_H
 
+#include <array>
 #include <cstddef>
+#include <cstdint>
+#include <map>
 #include <string>
 #include <vector>
 
@@ -13,7 +16,7 @@
 
 namespace migration {
 
-// A definition of a plan. Of one that the site did not touch in any case, no texts are kept.
+// A definition that the site may have touched, or that is undecided.
 struct FleetPlanRow {
   std::string kind;
   std::string oid;  // OLD's, when it has it
@@ -41,6 +44,28 @@ struct FleetPlanRow {
   bool isUndecided() const { return outcome == "undecided"; }
 };
 
+// Definitions that nobody but the release touched, which are most of a plan: their texts stand one
+// behind another in one text, so that none takes room of its own.
+class UntouchedRows {
+ public:
+  // Keeps kind, side, OID and names.
+  void add(const FleetPlanRow& row);
+
+  std::size_t count() const { return m_rows.size(); }
+  // Sets these of *row to those of the one at this place.
+  void copy(std::size_t at, FleetPlanRow* row) const;
+
+ private:
+  struct Row {
+    std::size_t begin = 0;
+    std::array<std::size_t, 3> lengths{};
+    std::uint8_t kind = 0;
+    char side = ' ';
+  };
+  std::string m_bytes;
+  std::vector<Row> m_rows;
+};
+
 struct FleetPlanFile {
   std::string role;
   std::string path;
@@ -54,6 +79,12 @@ struct FleetPlan {
   std::size_t refusals = 0;
   std::vector<FleetPlanFile> files;  // of BASE and NEW
   std::vector<FleetPlanRow> rows;
+  UntouchedRows untouched;
+  // By OLD's OIDs, those of attribute types that a site renumbered, as all know them.
+  std::map<std::string, std::string> renumbered;
+
+  // The OID of a vendor extension is no clause of it: it is that of its attribute type.
+  void followAttribute(FleetPlanRow* row) const;
 };
 
 // Reads it in one pass, whatever the order of its members. Returns false, and a failure at its
