@@ -44,6 +44,7 @@ struct FleetGroup {
   std::vector<std::size_t> installations;  // places in the fleet's list, ascending
 };
 
+// A definition, and how the installations of a release have it.
 struct FleetDefinition {
   std::size_t release = 0;  // a place in the fleet's list
   std::string kind;         // "attribute-type"
@@ -77,6 +78,7 @@ struct FleetQuestion {
   std::size_t readyThen = 0;
 };
 
+// An installation, and how far its plan is.
 struct FleetInstallation {
   std::string name;
   std::string path;  // of its plan
@@ -118,6 +120,7 @@ struct FleetQuery {
 // rest: what no installation changed takes no more room for more plans.
 class FleetReader {
  public:
+  // Begins without any plan.
   explicit FleetReader(FleetQuery query);
   FleetReader(const FleetReader&) = delete;
   FleetReader& operator=(const FleetReader&) = delete;
