@@ -40,7 +40,7 @@ const std::vector<Subject>& subjects() {
        at("1.1 NAME 'a' SINGLE-VALUE USAGE u"), at("1.1 NAME 'a' USAGE release"), "USAGE",
        "( 1.1 NAME ( 'a' ) USAGE u )", "( 1.1 NAME ( 'a' ) USAGE site )",
        "( 1.1 NAME ( 'a' ) SINGLE-VALUE USAGE site )", at("7.1 NAME ( 'r' 'A' ) USAGE u"),
-       "its name 'a' belongs to NEW's attribute type r (7.1)"},
+       "its name 'a' belongs to NEW's attribute type r (7.1), which may be the same one, renamed"},
       {"object class c (2.1)", "", oc("2.1 NAME 'c' ABSTRACT MAY ( x )"),
        oc("2.1 NAME 'c' AUXILIARY MAY ( x )"), oc("2.1 NAME 'c' ABSTRACT MAY ( x $ n )"),
        oc("2.1 NAME 'c' STRUCTURAL MAY ( x )"), "KIND", "( 2.1 NAME ( 'c' ) ABSTRACT MAY ( x ) )",

@@ -291,9 +291,9 @@ TEST(ThreeWay, WhatIsTakenIsUndecidedAndItsExtensionGoesWithIt) {
        {"", site + orv("9.1 DBNAME ( 'badge' )"), at("1.5 NAME ( 'x' 'Badge' ) USAGE u")},
        "attribute type x (1.5): added by release -> new (the release added it)\n"
        "attribute type badge (9.1): taken -> undecided (its name 'badge' belongs to NEW's "
-       "attribute type x (1.5))\n"
+       "attribute type x (1.5), which may be the same one, renamed)\n"
        "vendor extension 9.1: taken -> undecided (goes with its attribute type: its name 'badge' "
-       "belongs to NEW's attribute type x (1.5))\n"},
+       "belongs to NEW's attribute type x (1.5), which may be the same one, renamed)\n"},
       {"AnAliasThatTheSiteAdded",
        {kPlain, at("1.1 NAME ( 'a' 'badge' ) DESC 'd' USAGE u"),
         kPlain + at("1.5 NAME 'badge' USAGE u")},
@@ -490,7 +490,7 @@ TEST(ThreeWay, WithoutBaseNobodyCanTell) {
            {"", at("9.1 NAME 'x' USAGE u"), at("1.5 NAME ( 'y' 'x' ) USAGE u")},
            "attribute type y (1.5): unknown -> new (only NEW has it)\n"
            "attribute type x (9.1): unknown -> undecided (its name 'x' belongs to NEW's attribute "
-           "type y (1.5))\n"},
+           "type y (1.5), which may be the same one, renamed)\n"},
       },
       Prefer::kNothing, false);
 }
@@ -517,7 +517,7 @@ TEST(ThreeWay, APreferenceDecidesOnlyClausesInConflict) {
            {"", at("9.1 NAME 'x' USAGE u"), at("1.5 NAME ( 'y' 'x' ) USAGE u")},
            "attribute type y (1.5): added by release -> new (the release added it)\n"
            "attribute type x (9.1): taken -> undecided (its name 'x' belongs to NEW's attribute "
-           "type y (1.5))\n"},
+           "type y (1.5), which may be the same one, renamed)\n"},
           {"NotWhatHasTwoOids",
            {"", at("9.1 NAME 'a' USAGE u"), at("1.1 NAME 'a' USAGE u")},
            "attribute type a (9.1): changed by both, in conflict, renumbered -> undecided (the site "

@@ -39,14 +39,22 @@ std::string renderFiles(const std::vector<migration::ExampleFile>& files) {
   return result;
 }
 
+// Lists and settings are the administrator's own files, and no server reads them.
+bool isOfLists(const migration::RuleInfo& rule) {
+  const std::string id(rule.id);
+  return id.front() == 'O' || id.front() == 'S' || id == "T307";
+}
+
 }  // namespace
 
 std::string renderPage(const migration::RuleInfo& rule) {
   return std::string(rule.id) + " " + rule.name + " (" +
          std::string(migration::wordOf(rule.severity)) + ")\n\n" + inLines("  ", rule.what) +
          "\n  An example:\n" + renderFiles(rule.example) + "\n" + inLines("  Why: ", rule.why) +
-         "\n" + inLines("  How to mend it: ", rule.mend) + "\n  This is no " + rule.id + ":\n" +
-         renderFiles(rule.nearMiss);
+         "\n" +
+         inLines(isOfLists(rule) ? "  How to mend it: " : "  How to mend it, in a copy: ",
+                 rule.mend) +
+         "\n  This is no " + rule.id + ":\n" + renderFiles(rule.nearMiss);
 }
 
 std::string renderList(const std::vector<const migration::RuleInfo*>& rules) {

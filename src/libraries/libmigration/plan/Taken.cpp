@@ -42,6 +42,13 @@ bool mayBring(const Verdict& row) {
   return row.match.old != nullptr && (row.isCarried() || row.isUndecided()) && !row.isTaken;
 }
 
+// Whether the two, which have nothing of the other release to go with, may be one and the same that
+// got another first name and another OID.
+bool mayBeRenamed(const Verdict& row, const Verdict& holder) {
+  return row.match.latest == nullptr && holder.match.old == nullptr &&
+         foldedFirstNameOf(*row.match.old) != foldedFirstNameOf(*holder.match.latest);
+}
+
 // What is taken, with its holder: "its name cn is that of attribute type x (1.2)"; or "".
 std::string takenBy(const ResultIndex& index, const Verdict& row) {
   const auto told = [](const std::string& what, const Verdict* holder) {
@@ -66,8 +73,10 @@ std::string takenBy(const ResultIndex& index, const Verdict& row) {
     }
   }
   for (const std::string& name : broughtBy(row.match, namesOf)) {
-    if (reason.empty()) {
-      reason = told("its name '" + name + "'", index.byName(row.kind(), name, &row));
+    const Verdict* const holder = index.byName(row.kind(), name, &row);
+    if (reason.empty() && holder != nullptr) {
+      reason = told("its name '" + name + "'", holder);
+      reason += mayBeRenamed(row, *holder) ? ", which may be the same one, renamed" : "";
     }
   }
   return reason;

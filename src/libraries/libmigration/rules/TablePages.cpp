@@ -90,7 +90,7 @@ std::vector<RuleInfo> pagesOfFiles() {
        "Withdrawing takes a definition out of V3.modifiedschema and out of what is compared, but "
        "every other file that was read with its OID, be it that of the vendor extension, is still "
        "written with it.",
-       "Exclude the OID instead, or delete the definition from the other file.",
+       "Exclude the OID instead.",
        {{"V3.modifiedschema", kBadge},
         {"V3.user.at", kBadge},
         {"withdraw.txt", "1.3.6.1.4.1.99999.1\n"}},

@@ -171,10 +171,12 @@ void checkConfig(const Installation& installation, const Entry& entry, Findings*
   std::string text = entry.file->name +
                      " is read but never written, and none of its definitions is carried over to "
                      "another file; ";
-  text += counting == &entry || counting == nullptr
-              ? "move the definition to a user's file if the new release has to have it"
-              : "what is written under this OID is the definition of " + fileAndLine(*counting) +
-                    "; delete this one unless the server needs it here";
+  text +=
+      counting == &entry || counting == nullptr
+          ? "if the new release has to have it, move the definition to a user's file in a copy of "
+            "the directory, and migrate that"
+          : "what is written under this OID is the definition of " + fileAndLine(*counting) +
+                "; look whether that one is meant";
   addFinding("T305", Severity::kWarning, entry, entry.kept->offset, std::move(text), findings);
 }
 
@@ -253,7 +255,7 @@ void checkWithdrawal(const CheckRequest& request, Findings* findings) {
                            describeWithPlace(*entry) +
                                " is withdrawn, and is still written, "
                                "since its OID stands in " +
-                               files + "; exclude the OID instead, or delete the definition there",
+                               files + "; exclude the OID instead",
                            describe(*entry)});
     }
   }
