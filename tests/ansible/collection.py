@@ -92,7 +92,8 @@ def every_file_can_be_read(fleet):
         subprocess.run(["yamllint", "--strict", "-d", rules, COLLECTION], check=True)
     Site(fleet, "one")
     fleet.write_inventory()
-    subprocess.run(["ansible-playbook", "--syntax-check", "-i", fleet.root / "inventory.json", fleet.control / "upgrade.yml"],
+    subprocess.run(["ansible-playbook", "--syntax-check", "-i", fleet.root / "inventory.json", fleet.control / "upgrade.yml",
+                    fleet.control / "rollback.yml"],
                    env=fleet.environment(), check=True, stdout=subprocess.DEVNULL)
     subprocess.run(["ansible-galaxy", "collection", "build", "--output-path", fleet.root / "built", COLLECTION],
                    env=fleet.environment(), check=True, stdout=subprocess.DEVNULL)

@@ -18,14 +18,27 @@ import tempfile
 TOOL = pathlib.Path(os.environ["SCHEMA_MIGRATE"])
 SOURCE = pathlib.Path(os.environ["SOURCE"])
 EXAMPLES = SOURCE / "examples"
-PLAYBOOK = """---
+PLAYBOOKS = {
+    "upgrade.yml": """---
 - name: Upgrade
   hosts: all
   gather_facts: false
   environment: "{{ test_environment }}"
   roles:
     - directory.schema.upgrade
-"""
+""",
+    "rollback.yml": """---
+- name: Roll back
+  hosts: all
+  gather_facts: false
+  environment: "{{ test_environment }}"
+  tasks:
+    - name: Roll back
+      ansible.builtin.import_role:
+        name: directory.schema.upgrade
+        tasks_from: rollback
+""",
+}
 SANITIZERS = ("ASAN_OPTIONS", "LSAN_OPTIONS", "UBSAN_OPTIONS")
 
 
@@ -99,7 +112,8 @@ class Fleet:
         self.sites = {}
         self.connection = {"ansible_connection": "local"}
         self.settings = {}
-        (self.control / "upgrade.yml").write_text(PLAYBOOK)
+        for name, text in PLAYBOOKS.items():
+            (self.control / name).write_text(text)
         (self.root / "ansible.cfg").write_text("")
 
     def __enter__(self):
@@ -130,9 +144,9 @@ class Fleet:
         (self.root / "inventory.json").write_text(json.dumps({"all": {"vars": everywhere, "hosts": hosts}}))
 
     # With a group, its process group stands in that file, so that it can be killed.
-    def play(self, *arguments, group=None, **variables):
+    def play(self, *arguments, playbook="upgrade.yml", group=None, **variables):
         self.write_inventory()
-        command = ["ansible-playbook", "-i", str(self.root / "inventory.json"), str(self.control / "upgrade.yml"),
+        command = ["ansible-playbook", "-i", str(self.root / "inventory.json"), str(self.control / playbook),
                    *arguments]
         if variables:
             command += ["--extra-vars", json.dumps(variables)]

@@ -60,7 +60,7 @@ def servers(fleet):
     for name in ("unstoppable", "writing"):
         expect(name, ["stop old", "start old", "stop old", "start new"], log_of(fleet, name))
     expect("what the server had written", written, tree(fleet.sites["writing"].work / "standby"))
-    fleet.play("--limit", "served", schema_upgrade_state="rolled_back").expect(failed=[], changed=["served"])
+    fleet.play("--limit", "served", playbook="rollback.yml").expect(failed=[], changed=["served"])
     expect("rolled back", ["stop old", "start new", "stop new", "start old"], log_of(fleet, "served"))
     expect("its schema", before["served"], tree(fleet.sites["served"].schema))
 

@@ -12,7 +12,7 @@ def main():
         small.site.take_room_away()
         scenario.check_mode(fleet)
         scenario.upgrade(fleet, originals)
-        scenario.second_run(fleet)
+        scenario.second_run(fleet, sites.READY)
         scenario.decide(fleet, originals)
         scenario.roll_back(fleet, before, sites.ALL)
         scenario.answers_are_left_alone(fleet)

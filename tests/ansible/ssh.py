@@ -23,8 +23,8 @@ def run(fleet, small):
     before = scenario.schema_trees(fleet, sites.ALL)
     small.site.take_room_away()
     scenario.upgrade(fleet, originals)
-    scenario.second_run(fleet)
-    scenario.roll_back(fleet, before, sites.READY)
+    scenario.second_run(fleet, sites.READY[:3])
+    scenario.roll_back(fleet, before, sites.READY[:3])
 
 
 main()
