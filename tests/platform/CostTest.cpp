@@ -6,6 +6,7 @@
 #include <map>
 #include <string>
 
+#include "CSymbolTable.h"
 #include "Installation.h"
 #include "Machine.h"
 #include "PlatformFunctions.h"
@@ -134,6 +135,21 @@ TEST(Cost, WritingComparesAsOftenForEachDefinition) {
         count, [&] { EXPECT_EQ(installation->writeFile(installation.path(), "V3.user.at"), 0); });
   };
   EXPECT_LT(writing(kMany).comparisons, writing(kFew).comparisons + 1);
+}
+
+// The texts of a table are spread: a look-up compares a few of them, however many are as long.
+TEST(CSymbolTable, LookUpComparesFewTexts) {
+  constexpr int kTexts = 64;
+  CSymbolTable table;
+  for (int i = 0; i < kTexts; ++i) {
+    table.insertValue("word-" + std::to_string(100 + i), i, true);
+  }
+  const auto lookUps = [&] {
+    for (int i = 0; i < kTexts; ++i) {
+      EXPECT_EQ(table.lookUpValue("word-" + std::to_string(100 + i)), i);
+    }
+  };
+  EXPECT_LT(costsOf(kTexts, lookUps).comparisons, 6);
 }
 
 }  // namespace
