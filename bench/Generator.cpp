@@ -1,6 +1,7 @@
 #include "Generator.h"
 
 #include <fstream>
+#include <optional>
 #include <string_view>
 
 namespace bench {
@@ -247,11 +248,24 @@ struct Installation {
   Output userClasses;
 };
 
+// What differs is in the base as the older one has it, as the newer one has it, or not at all, in
+// turn: so that the release or the site changed, added or removed it, or both did.
+template <typename Add>
+void addToBase(std::size_t index, Relation relation, Installation* base, Add add) {
+  const std::size_t way = index % 3;
+  const bool isAsOld = way == 0 && relation != Relation::kOnlyNew;
+  const bool isAsNew = way == 1 && relation != Relation::kOnlyOld;
+  if (relation == Relation::kEqual || isAsOld || isAsNew) {
+    add(base, index, relation, isAsOld && relation == Relation::kChanged);
+  }
+}
+
 // Adds definitions, from index 0 on, until the older installation has `count` of them. `add` gets
 // the installation, the index, the relation, and whether the definition is the changed form.
+// `base` may be null.
 template <typename Add>
 void generate(std::size_t count, std::uint64_t seed, std::uint64_t stream, Installation* older,
-              Installation* newer, Add add) {
+              Installation* newer, Installation* base, Add add) {
   std::size_t inOld = 0;
   for (std::size_t index = 0; inOld < count; ++index) {
     const Relation relation = relationOf(seed, stream + index);
@@ -262,20 +276,28 @@ void generate(std::size_t count, std::uint64_t seed, std::uint64_t stream, Insta
     if (relation != Relation::kOnlyOld) {
       add(newer, index, relation, false);
     }
+    if (base != nullptr) {
+      addToBase(index, relation, base, add);
+    }
   }
 }
 
 }  // namespace
 
 bool generateSchemas(std::size_t count, std::uint64_t seed, const std::string& oldDirectory,
-                     const std::string& newDirectory) {
+                     const std::string& newDirectory, const std::string& baseDirectory) {
   constexpr std::uint64_t kTypes = 0;
   constexpr std::uint64_t kClasses = std::uint64_t{1} << 32;
   const std::size_t classes = count * 8 / 100;
   const std::size_t types = (count - classes) / 2;
   Installation older(oldDirectory, true);
   Installation newer(newDirectory, false);
-  generate(types, seed, kTypes, &older, &newer,
+  std::optional<Installation> shipped;
+  if (!baseDirectory.empty()) {
+    shipped.emplace(baseDirectory, false);
+  }
+  Installation* const base = shipped ? &*shipped : nullptr;
+  generate(types, seed, kTypes, &older, &newer, base,
            [&](Installation* out, std::size_t index, Relation relation, bool isChanged) {
              Output& file = isInSystemFile(index, relation) ? out->systemTypes : out->userTypes;
              if (index % kGroup == 0) {
@@ -284,12 +306,12 @@ bool generateSchemas(std::size_t count, std::uint64_t seed, const std::string& o
              file.add(attributeType(Random(seed, kTypes + index), index, isChanged));
              out->extensions.add(extension(Random(seed + 1, index), index, isChanged));
            });
-  generate(classes, seed, kClasses, &older, &newer,
+  generate(classes, seed, kClasses, &older, &newer, base,
            [&](Installation* out, std::size_t index, Relation relation, bool isChanged) {
              Output& file = isInSystemFile(index, relation) ? out->systemClasses : out->userClasses;
              file.add(objectClass(Random(seed, kClasses + index), index, isChanged));
            });
-  return older.finish() && newer.finish();
+  return older.finish() && newer.finish() && (base == nullptr || base->finish());
 }
 
 }  // namespace bench

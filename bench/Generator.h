@@ -18,9 +18,10 @@ constexpr std::uint64_t kSeed = 20011103;
 // Writes the five files V3.system.at, V3.system.oc, V3.orv.at, V3.user.at and V3.user.oc into each
 // of the two folders, which must exist. `count` definitions in all stand in the older one:
 // attribute types and their vendor extensions in equal numbers, and eight object classes to the
-// hundred. Returns false when a file could not be written.
+// hundred. A third folder gets a base of the two, from which each of them differs. Returns false
+// when a file could not be written.
 bool generateSchemas(std::size_t count, std::uint64_t seed, const std::string& oldDirectory,
-                     const std::string& newDirectory);
+                     const std::string& newDirectory, const std::string& baseDirectory = "");
 
 }  // namespace bench
 

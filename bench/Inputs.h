@@ -42,6 +42,7 @@ struct Input {
   Origin origin = Origin::kReal;
   std::string older;
   std::string newer;
+  std::string base;      // what both came from; "" for none
   std::string excluded;  // lists of OIDs for the older one, "" for none
   std::string withdrawn;
   FileList olderFiles;

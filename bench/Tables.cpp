@@ -89,6 +89,17 @@ std::string checks(const std::vector<CheckRow>& rows) {
   return text;
 }
 
+std::string plans(const std::vector<PlanningRow>& rows) {
+  std::string text =
+      line({"work", "input", "time", "÷ the library's", "goal", "exponent", "goal"}) + rule(2, 5);
+  for (const PlanningRow& row : rows) {
+    text += line({row.work, row.input, duration(row.seconds), ratio(row.toOwn),
+                  verdict(row.toOwn, row.goal), ratio(row.exponent),
+                  verdict(row.exponent, row.growthGoal)});
+  }
+  return text;
+}
+
 std::string growth(const std::vector<GrowthRow>& rows) {
   std::string text =
       line({"input", "K", "time at K", "time at 4K", "exponent", "goal"}) + rule(1, 5);
@@ -112,6 +123,7 @@ std::string asMarkdown(const Results& results) {
   section("Ratios", ratios(results.ratios), results.ratios.empty());
   section("Peak memory", memory(results.memory), results.memory.empty());
   section("Checking an installation", checks(results.checks), results.checks.empty());
+  section("Planning and migrating", plans(results.plans), results.plans.empty());
   section("Growth", growth(results.growth), results.growth.empty());
   return text;
 }

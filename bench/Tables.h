@@ -51,10 +51,23 @@ struct CheckRow {
   double growthGoal = 0;
 };
 
+// A plan, or a migration by one, beside what the library does of it.
+struct PlanningRow {
+  std::string work;
+  std::string input;
+  double definitions = 0;
+  double seconds = 0;
+  double toOwn = 0;
+  double goal = 0;
+  double exponent = 0;  // from the row before it on; 0 without one
+  double growthGoal = 0;
+};
+
 struct Results {
   std::vector<RatioRow> ratios;
   std::vector<MemoryRow> memory;
   std::vector<CheckRow> checks;
+  std::vector<PlanningRow> plans;
   std::vector<GrowthRow> growth;
 };
 

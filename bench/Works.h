@@ -32,6 +32,9 @@ struct Work {
 
 const std::vector<Work>& works();
 
+// The example holds definitions that belong to no file of those that the library writes.
+bool mayBeMerged(const Input& input);
+
 // Runs every operation with the library and with the floor on the input and compares all that they
 // write and report. Returns "" when nothing differs, or what differs first. `folder` is for the
 // files. The peer is held to have met every definition and to have refused none.

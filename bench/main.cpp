@@ -26,6 +26,7 @@
 #include "Hostile.h"
 #include "Inputs.h"
 #include "Measure.h"
+#include "Planning.h"
 #include "Tables.h"
 #include "Works.h"
 
@@ -91,6 +92,7 @@ std::optional<Options> parse(int argc, char** argv) {
 Input exampleInput(const Options& options) {
   const std::string& folder = options.examples;
   Input input = bench::makeInput("example", Origin::kExample, folder + "/old", folder + "/new");
+  input.base = folder + "/base";
   input.excluded = folder + "/excluded-oids.txt";
   input.withdrawn = folder + "/withdraw-oids.txt";
   return input;
@@ -100,10 +102,13 @@ Input generatedInput(std::size_t count, const bench::TemporaryFolder& files) {
   const std::string name = std::to_string(count);
   const std::string older = files.folder(name + "/old");
   const std::string newer = files.folder(name + "/new");
-  if (!bench::generateSchemas(count, bench::kSeed, older, newer)) {
+  const std::string base = files.folder(name + "/base");
+  if (!bench::generateSchemas(count, bench::kSeed, older, newer, base)) {
     throw std::runtime_error("cannot write the generated schemas");
   }
-  return bench::makeInput(name, Origin::kGenerated, older, newer);
+  Input input = bench::makeInput(name, Origin::kGenerated, older, newer);
+  input.base = base;
+  return input;
 }
 
 std::vector<std::size_t> sizesOf(const Options& options) {
@@ -259,6 +264,34 @@ void measureCheck(benchmark::State& state, const Input& input, bench::Results* r
   results->checks.push_back(row);
 }
 
+// diff beside the library's reading of the three, or migrate beside the library's cycle.
+void measurePlanning(benchmark::State& state, const bench::PlanningWork& work, const Input& input,
+                     const std::string& output, bench::Results* results) {
+  Contender planning(work.run(input, output));
+  Contender own(work.own(input, output));
+  for (auto _ : state) {
+    planning.measure();
+    own.measure();
+    state.SetIterationTime(planning.seconds.back());
+  }
+  bench::PlanningRow row;
+  row.work = work.name;
+  row.input = input.name;
+  row.definitions = input.olderFiles.definitions;
+  row.seconds = bench::median(planning.seconds);
+  row.toOwn = medianRatio(planning.seconds, own.seconds);
+  row.goal = bench::hasCheckGoals(input) ? work.goal : 0;
+  const bool isNext = !results->plans.empty() && results->plans.back().work == row.work;
+  if (input.origin == Origin::kGenerated && bench::hasCheckGoals(input) && isNext) {
+    const bench::PlanningRow& before = results->plans.back();
+    row.exponent =
+        std::log(row.seconds / before.seconds) / std::log(row.definitions / before.definitions);
+    row.growthGoal = bench::kPlanningGrowthGoal;
+  }
+  state.counters["to the library's"] = row.toOwn;
+  results->plans.push_back(row);
+}
+
 void measureGrowth(benchmark::State& state, const bench::HostileCase& hostile,
                    bench::Results* results) {
   const bench::TemporaryFolder files;
@@ -336,6 +369,17 @@ void addAll(const std::vector<Input>& inputs, const Options& options, const std:
   for (const Input& input : inputs) {
     add("check/" + input.name, roundsOf(input, options),
         [&, results](benchmark::State& state) { measureCheck(state, input, results); });
+  }
+  for (const bench::PlanningWork& work : bench::planningWorks()) {
+    for (const Input& input : inputs) {
+      if (!bench::mayBeMerged(input)) {
+        continue;
+      }
+      add(work.name + "/" + input.name, roundsOf(input, options),
+          [&, output, results](benchmark::State& state) {
+            measurePlanning(state, work, input, output, results);
+          });
+    }
   }
   if (!options.hasGrowth) {
     return;
