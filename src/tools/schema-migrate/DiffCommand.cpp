@@ -78,9 +78,11 @@ class DiffCommand : public Command {
     m_filter.isWithSame = std::find(m_filter.changes.begin(), m_filter.changes.end(), "same") !=
                           m_filter.changes.end();
     m_html.open();
+    const bool isJson = m_format == "json";
+    // The text tells nothing of what the rules find.
+    m_options.request.isChecked = isJson || m_html.isWanted();
     const std::unique_ptr<migration::MigrationPlan> plan = m_options.makePlan();
     const ShownDifferences shown = shownOf(*plan, m_filter);
-    const bool isJson = m_format == "json";
     const std::string document =
         isJson || m_html.isWanted() ? renderPlanJson(*plan, shown, "diff") : "";
     if (m_html.isWanted()) {

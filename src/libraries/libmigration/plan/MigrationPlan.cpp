@@ -41,7 +41,9 @@ void draw(MigrationPlan* plan) {
   plan->undecidedCount = static_cast<std::size_t>(
       std::count_if(threeWay.differences.begin(), threeWay.differences.end(),
                     [](const Verdict& row) { return row.isUndecided(); }));
-  checkResult(plan);
+  if (plan->asked.isChecked) {
+    checkResult(plan);
+  }
 }
 
 class PlanMaker {
@@ -55,7 +57,9 @@ class PlanMaker {
     if (!m_plan->failures.empty()) {
       return std::move(m_plan);
     }
-    checkInputs();
+    if (m_request.isChecked) {
+      checkInputs();
+    }
     // One directory may be two of the inputs.
     dropRepeated(&m_plan->ofInputs);
     dropRepeated(&m_plan->repairs);
@@ -63,7 +67,9 @@ class PlanMaker {
     m_plan->threeWay = compareThreeWay(m_plan->request);
     doubtBase();
     m_plan->inputRefusalCount = m_plan->refusals.size();
-    tell("checking the result");
+    if (m_request.isChecked) {
+      tell("checking the result");
+    }
     draw(m_plan.get());
     return std::move(m_plan);
   }

@@ -32,6 +32,9 @@ struct PlanRequest {
   bool allowUnused = false;  // decisions that match nothing, or are for other texts
   bool acceptBase = false;   // a BASE that equals OLD, or NEW
   bool isRepaired = false;   // what can be mended is mended, in memory
+  // Whether the rules look at the inputs and at the result. A plan of which they do not tells what
+  // differs and what comes of it, and is none to carry out.
+  bool isChecked = true;
   ReadLimits limits;
   // Called with what is done next, as in "reading OLD": a plan of many definitions takes its time.
   std::function<void(const char* step)> onStep;
@@ -66,7 +69,9 @@ struct MigrationPlan {
   std::size_t undecidedCount = 0;
 
   // Whether the migration may go ahead.
-  bool isReady() const { return failures.empty() && refusals.empty() && undecidedCount == 0; }
+  bool isReady() const {
+    return asked.isChecked && failures.empty() && refusals.empty() && undecidedCount == 0;
+  }
 
   // What everything above refers to.
   ThreeWayRequest request;
