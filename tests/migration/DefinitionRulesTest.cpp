@@ -49,6 +49,10 @@ const Row kRows[] = {
     {"D203Ended", "objectclasses=( 1.2 NAME 'a' STRUCTURAL )\n", ""},
     {"D203ExtensionIsNoEnd", "attributetypes=( 1.2 NAME 'a' X-B 'c' )\n",
      "1:22 error D203\n1:31 error D207\n"},
+    {"D203BehindADefinitionWithAnUnclosedQuote",
+     "attributetypes=( 1.2 DESC 'a SUP c )\nattributetypes=( 1.3 NAME 'b' )\n"
+     "attributetypes=( 1.4 SUP a )\n",
+     "1:27 error L103\n2:22 error D203\n"},
     // D204
     {"D204BeforeASection", "attributetypes=( 1.2 SUP a\nattributetypes=( 1.3 SUP b )\n",
      "1:16 error D204\n"},

@@ -11,6 +11,7 @@
 
 #include "CheckRun.h"
 #include "Comparison.h"
+#include "DefinitionView.h"
 #include "Inheritance.h"
 #include "InputFiles.h"
 #include "OidList.h"
@@ -127,6 +128,38 @@ TEST(Installation, TellsWhatSharesANameOrAnOid) {
       "b: V3.user.at:2 V3.user.at:3 V3.user.at:4\nx: V3.user.at:2 V3.user.at:3\n"
       " V3.user.at:2 V3.user.at:4\n V3.user.at:3 V3.user.at:4\n",
       text);
+}
+
+std::string viewsOf(const Installation& schema, migration::Reading reading) {
+  std::string text;
+  for (const migration::DefinitionView& view : migration::definitionsOf(schema, reading)) {
+    text += view.title() + ":";
+    for (const migration::ClauseText& clause : view.clauses()) {
+      text += " " + clause.text();
+    }
+    text += " -> " + placeOf(view.entry()) + "\n";
+  }
+  return text;
+}
+
+TEST(Definitions, AreThoseThatAreKeptOrThoseThatAreWritten) {
+  const Installation schema = support::installationOf(
+      {{"V3.user.at",
+        "attributetypes=( 1.1 NAME ( 'a' 'b' ) DESC 'd' )\n"
+        "attributetypes=( 1.2 NAME 'late' DESC 'd'\n"
+        "attributetypes=( 1.3 NAME 'later' DESC 'd' )\n"},
+       {"V3.user.oc", "objectclasses=( 1.4 NAME 'c' AUXILIARY MUST ( a $ b ) )\n"}},
+      "", "old");
+  EXPECT_EQ(
+      "attribute type a (1.1): NAME ( 'a' 'b' ) DESC 'd' USAGE userApplications -> V3.user.at:1\n"
+      "object class c (1.4): NAME 'c' AUXILIARY MUST ( a $ b ) -> V3.user.oc:1\n",
+      viewsOf(schema, migration::Reading::kKept));
+  EXPECT_EQ(
+      "attribute type a (1.1): NAME ( 'a' 'b' ) DESC 'd' -> V3.user.at:1\n"
+      "attribute type late (1.2): NAME 'late' DESC 'd' -> none\n"
+      "attribute type later (1.3): NAME 'later' DESC 'd' -> none\n"
+      "object class c (1.4): NAME 'c' AUXILIARY MUST ( a $ b ) -> V3.user.oc:1\n",
+      viewsOf(schema, migration::Reading::kWritten));
 }
 
 class Directory : public testing::Test {

@@ -104,6 +104,9 @@ const Row kRows[] = {
                  12),
      "1:1 error L107\n"},
     {"L107Utf16WithoutMark", std::string("a\0t\0t\0r\0i\0b\0", 12), "1:1 error L107\n"},
+    // Of ten letters, two that are not Latin.
+    {"L107Utf16WithOtherLetters", std::string("a\0t\0t\0r\0\x37\x04i\0b\0\x38\x04u\0t\0", 20),
+     "1:1 error L107\n"},
     {"L107MarkBehindTheBeginning", "attributetypes=( 1.2 SUP a )\n\xef\xbb\xbf\n",
      "2:1 error L105\n"},
     // L108

@@ -122,6 +122,8 @@ const Row kRows[] = {
     {"StrayParentheses", "attributetypes=( 1.2 SUP ( a ) ( DESC 'b' ) NAME ( 'c' USAGE d )\n",
      "1:16-1:65 attribute type = OID 1.2 | SUP ( a ) | DESC 'b' | NAME ( 'c' ) | USAGE d\n",
      "1:26 StrayParenthesis [(]\n1:32 StrayParenthesis [(]\n1:50 StrayParenthesis [(]\n"},
+    {"CommentBehindATab", "\t # x\n\t# y\nattributetypes=( 1.2 SUP c )\n",
+     "\t # x\n\t# y\n3:16-3:29 attribute type = OID 1.2 | SUP c\n", ""},
     {"DoubleQuoteThatTheLineEnds", "attributetypes=( 1.2 DESC \"b\nSUP c )\n",
      "1:16-2:8 attribute type = OID 1.2 | DESC \"\" | <b> | SUP c\n", "1:27 DoubleQuote [\"]\n"},
     {"DoubleQuotes", "attributetypes=( 1.2 NAME \"a\" DESC \"b c\" )\n",
