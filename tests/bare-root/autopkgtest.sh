@@ -9,6 +9,6 @@ printf '\n== autopkgtest\n'
 printf 'deb [trusted=yes] file:/srv/new ./\n' >/etc/apt/sources.list.d/libschema.list
 apt-get -qq update
 apt-get -qq -y --no-install-recommends install autopkgtest >apt.log 2>&1 || { cat apt.log; exit 1; }
-autopkgtest --no-built-binaries new/*.deb libschema --output-dir results -- null >autopkgtest.log 2>&1 ||
+autopkgtest --no-built-binaries new/*.deb libschema/ --output-dir results -- null >autopkgtest.log 2>&1 ||
   { tail -n 60 autopkgtest.log; exit 1; }
 cat results/summary
