@@ -361,12 +361,13 @@ std::string renderComplaints(const FleetReport& report) {
       !fleet.installations.empty()) {
     lines += errorLine("nothing here is called " + wholePrintable(report.query.definition));
   }
-  if (fleet.questionCount != 0) {
-    lines += errorLine(
-        "undecided: " + counted(fleet.questionCount, "question") + " at " +
-        counted(std::count_if(fleet.installations.begin(), fleet.installations.end(),
-                              [](const FleetInstallation& one) { return one.questions != 0; }),
-                "installation"));
+  std::size_t asked = 0;
+  for (const FleetInstallation& one : fleet.installations) {
+    asked += one.questions != 0 ? 1 : 0;
+  }
+  if (asked != 0) {
+    lines += errorLine("undecided: " + counted(fleet.questionCount, "question") + " at " +
+                       counted(asked, "installation"));
   }
   for (const FleetInstallation& one : fleet.installations) {
     if (one.refusals != 0) {
