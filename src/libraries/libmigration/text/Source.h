@@ -32,6 +32,7 @@ class Source {
   struct Borrowed {
     std::string_view bytes;
   };
+  // As the other; the bytes are not copied.
   Source(std::string path, Borrowed borrowed);
 
   Source(const Source&) = delete;
