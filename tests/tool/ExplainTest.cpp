@@ -73,8 +73,8 @@ TEST_P(EveryRule, PageHasItsParts) {
   EXPECT_EQ(0, result.exitCode);
   EXPECT_EQ("", result.err);
   EXPECT_EQ(0U, result.out.find(std::string(GetParam()->id) + " " + GetParam()->name + " ("));
-  for (const char* const part : {"\n\n  ", "\n  An example:\n    ",
-                                 "\n  Why: ", "\n  How to mend it", "\n  This is no "}) {
+  for (const char* const part :
+       {"\n\n  ", "\n  An example:\n    ", "\n  Why: ", "\n  How to mend it", "\n  This is no "}) {
     EXPECT_NE(std::string::npos, result.out.find(part)) << part << "\n" << result.out;
   }
   for (const std::string& line : support::splitLines(result.out)) {

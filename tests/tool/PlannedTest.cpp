@@ -222,7 +222,8 @@ TEST_F(Planned, DiffOfANameTellsItsExtensionToo) {
                      at("1.2 NAME 'b' DESC 'better' USAGE userApplications") +
                      orv("1.2 DBNAME ( 'b' 'b' ) ACCESS-CLASS normal LENGTH 9"));
   const ToolResult result = run("diff", {"--base", "@/base", "b"});
-  EXPECT_EQ(0U, result.out.find("vendor extension of b (1.2): changed by site -> old [structure]\n"))
+  EXPECT_EQ(0U,
+            result.out.find("vendor extension of b (1.2): changed by site -> old [structure]\n"))
       << result.out;
   EXPECT_EQ(std::string::npos, result.out.find("attribute type")) << result.out;
   EXPECT_EQ(1, result.exitCode);
