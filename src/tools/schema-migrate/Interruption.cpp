@@ -36,10 +36,11 @@ std::string_view messageOf(const migration::Removals::Placed& placed) {
   return placed.inPlace == placed.wanted ? kWithRecord : kWithoutRecord;
 }
 
-migration::Removals everything;
+// Never destroyed: a signal may come as late as among the last destructors.
+migration::Removals* const kEverything = new migration::Removals;
 
 extern "C" void removeAndEnd(int /*signal*/) {
-  const std::string_view message = messageOf(everything.run());
+  const std::string_view message = messageOf(kEverything->run());
   progress::erase();
   migration::writeAll(STDERR_FILENO, message);
   ::_exit(kNotWritten);
@@ -64,7 +65,7 @@ void install() {
   }
 }
 
-migration::Removals* removals() { return &everything; }
+migration::Removals* removals() { return kEverything; }
 
 void expectOutput() { isOutputExpected = true; }
 
