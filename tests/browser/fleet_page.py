@@ -2,26 +2,11 @@
 
 import collections
 
-from pages import By, Keys, PageTest, main
+from pages import By, EveryPage, Keys, PageTest, main
 
 
-class FleetPage(PageTest):
+class FleetPage(EveryPage, PageTest):
     page = "fleet"
-
-    def test_is_quiet(self):
-        self.check_is_quiet()
-
-    def test_structure(self):
-        self.check_structure()
-
-    def test_contrast(self):
-        self.check_contrast()
-
-    def test_narrow(self):
-        self.check_narrow()
-
-    def test_skip_link(self):
-        self.check_skip_link()
 
     def test_every_definition_and_question_is_told(self):
         document = self.document()

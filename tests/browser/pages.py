@@ -174,7 +174,14 @@ class PageTest(unittest.TestCase):
         requests = self.requests()
         self.assertEqual(1, len(requests), requests)
 
-    def check_structure(self):
+
+class EveryPage:
+    """What holds for the page of every command."""
+
+    def test_is_quiet(self):
+        self.check_is_quiet()
+
+    def test_structure(self):
         self.assertEqual("en", self.script("return document.documentElement.lang"))
         for selector in ("h1", "main", "header", "footer", "nav[aria-label]", "#filters[aria-label]"):
             self.assertEqual(1, len(self.all(selector)), selector)
@@ -198,7 +205,7 @@ class PageTest(unittest.TestCase):
           return Array.from(document.querySelectorAll('svg')).filter(
               (e) => !e.getAttribute('aria-label')).length;"""), "every picture is named")
 
-    def check_contrast(self):
+    def test_contrast(self):
         """Texts can be read in both schemes, and the two are not the same."""
         papers = []
         for scheme in ("light", "dark"):
@@ -208,12 +215,12 @@ class PageTest(unittest.TestCase):
             self.assertGreaterEqual(worst["ratio"], 4.5, f"{scheme}: {worst['text']}")
         self.assertNotEqual(*papers)
 
-    def check_narrow(self):
+    def test_narrow(self):
         self.resize(380, 800)
         self.assertLessEqual(
             self.script("return document.documentElement.scrollWidth"), 380)
 
-    def check_skip_link(self):
+    def test_skip_link(self):
         self.press(Keys.TAB)
         self.assertEqual("skip", self.focused("e.className"))
         self.assertTrue(self.script(

@@ -2,7 +2,7 @@
 
 import collections
 
-from pages import By, Keys, PageTest, WebDriverWait, main
+from pages import By, EveryPage, Keys, PageTest, WebDriverWait, main
 
 CLASS_WORDS = {
     "changed-by-both-mergeable": "changed by both, mergeable",
@@ -14,23 +14,8 @@ def class_word(word):
     return CLASS_WORDS.get(word, word.replace("-", " "))
 
 
-class PlanPage(PageTest):
+class PlanPage(EveryPage, PageTest):
     page = "plan"
-
-    def test_is_quiet(self):
-        self.check_is_quiet()
-
-    def test_structure(self):
-        self.check_structure()
-
-    def test_contrast(self):
-        self.check_contrast()
-
-    def test_narrow(self):
-        self.check_narrow()
-
-    def test_skip_link(self):
-        self.check_skip_link()
 
     def test_numbers_are_the_documents(self):
         document = self.document()

@@ -14,6 +14,7 @@
 #include "FleetNames.h"
 #include "Json.h"
 #include "Messages.h"
+#include "PageText.h"
 #include "PlannedFolder.h"
 #include "TerminalRun.h"
 
@@ -170,39 +171,6 @@ TEST_F(Fleet, ATemplateThatIsThereIsLeftAlone) {
 }
 
 // ---- Formats ----
-
-std::string replacedAll(std::string text, const std::string& from, const std::string& to) {
-  for (std::size_t at = 0; (at = text.find(from, at)) != std::string::npos; at += to.size()) {
-    text.replace(at, from.size(), to);
-  }
-  return text;
-}
-
-// The text of a page, without its elements.
-std::string textOf(const std::string& html) {
-  std::string text;
-  bool isInTag = false;
-  for (const char c : html) {
-    isInTag = isInTag || c == '<';
-    text += isInTag ? "" : std::string(1, c);
-    isInTag = isInTag && c != '>';
-  }
-  for (const auto& [escaped, plain] : std::vector<std::pair<std::string, std::string>>{
-           {"&lt;", "<"}, {"&gt;", ">"}, {"&quot;", "\""}, {"&#39;", "'"}, {"&amp;", "&"}}) {
-    text = replacedAll(text, escaped, plain);
-  }
-  return text;
-}
-
-// What a part of a page, or of the text, has to have in this order.
-void expectInOrder(const Arguments& parts, const std::string& text) {
-  std::size_t at = 0;
-  for (const std::string& part : parts) {
-    const std::size_t found = text.find(part, at);
-    EXPECT_NE(std::string::npos, found) << part << "\nis not in its place in\n" << text;
-    at = found == std::string::npos ? at : found + part.size();
-  }
-}
 
 std::string articleOf(const std::string& page, const std::string& id) {
   const std::size_t begin = page.find(" id=\"" + id + "\"");

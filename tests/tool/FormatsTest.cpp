@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "Files.h"
+#include "PageText.h"
 #include "ToolRun.h"
 
 namespace {
@@ -89,29 +90,6 @@ std::string inText(const Json& definition) {
 
 // ---- HTML ----
 
-std::string replaced(std::string text, const std::string& from, const std::string& to) {
-  for (std::size_t at = 0; (at = text.find(from, at)) != std::string::npos; at += to.size()) {
-    text.replace(at, from.size(), to);
-  }
-  return text;
-}
-
-// The text of a part of a page, without its elements.
-std::string textOf(const std::string& html) {
-  std::string text;
-  bool isInTag = false;
-  for (const char c : html) {
-    isInTag = isInTag || c == '<';
-    text += isInTag ? "" : std::string(1, c);
-    isInTag = isInTag && c != '>';
-  }
-  for (const auto& [escaped, plain] : std::vector<std::pair<std::string, std::string>>{
-           {"&lt;", "<"}, {"&gt;", ">"}, {"&quot;", "\""}, {"&#39;", "'"}, {"&amp;", "&"}}) {
-    text = replaced(text, escaped, plain);
-  }
-  return text;
-}
-
 // The element with the identifier "d" and the number, up to the end of one of its sort.
 std::string definitionIn(const std::string& page, std::size_t number, const std::string& element) {
   const std::size_t begin = page.find(" id=\"d" + std::to_string(number) + "\"");
@@ -158,15 +136,6 @@ std::vector<std::string> inPage(const Json& definition) {
     told.push_back(definition["decision"]);
   }
   return told;
-}
-
-void expectInOrder(const std::vector<std::string>& parts, const std::string& text) {
-  std::size_t at = 0;
-  for (const std::string& part : parts) {
-    const std::size_t found = text.find(part, at);
-    EXPECT_NE(std::string::npos, found) << part << "\nis not in its place in\n" << text;
-    at = found == std::string::npos ? at : found + part.size();
-  }
 }
 
 // In the text each finding has its line, or is counted among those of its rule and directory; diff

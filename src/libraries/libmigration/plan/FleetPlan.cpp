@@ -3,40 +3,18 @@
 #include <algorithm>
 #include <array>
 #include <cstdint>
-#include <iterator>
 #include <map>
 #include <nlohmann/json.hpp>
 #include <string_view>
 #include <utility>
+
+#include "CountingIterator.h"
 
 namespace migration {
 
 namespace {
 
 using Json = nlohmann::json;
-
-// Goes through the bytes and tells how far its last copy has come.
-class CountingIterator {
- public:
-  using iterator_category = std::input_iterator_tag;
-  using value_type = char;
-  using difference_type = std::ptrdiff_t;
-  using pointer = const char*;
-  using reference = const char&;
-
-  CountingIterator(const char* at, const char** reached) : m_at(at), m_reached(reached) {}
-  reference operator*() const { return *m_at; }
-  CountingIterator& operator++() {
-    *m_reached = ++m_at;
-    return *this;
-  }
-  bool operator==(const CountingIterator& other) const { return m_at == other.m_at; }
-  bool operator!=(const CountingIterator& other) const { return m_at != other.m_at; }
-
- private:
-  const char* m_at;
-  const char** m_reached;
-};
 
 enum class Shape : std::uint8_t { kNull, kFlag, kNumber, kText, kObject, kArray };
 

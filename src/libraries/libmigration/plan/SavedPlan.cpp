@@ -2,12 +2,12 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <iterator>
 #include <map>
 #include <nlohmann/json.hpp>
 #include <string_view>
 #include <utility>
 
+#include "CountingIterator.h"
 #include "PlanDocument.h"
 
 namespace migration {
@@ -19,29 +19,6 @@ using Json = nlohmann::json;
 using Pointer = Json::json_pointer;
 
 // ---- Places ----
-
-// Goes through the bytes and tells how far its last copy has come.
-class CountingIterator {
- public:
-  using iterator_category = std::input_iterator_tag;
-  using value_type = char;
-  using difference_type = std::ptrdiff_t;
-  using pointer = const char*;
-  using reference = const char&;
-
-  CountingIterator(const char* at, const char** reached) : m_at(at), m_reached(reached) {}
-  reference operator*() const { return *m_at; }
-  CountingIterator& operator++() {
-    *m_reached = ++m_at;
-    return *this;
-  }
-  bool operator==(const CountingIterator& other) const { return m_at == other.m_at; }
-  bool operator!=(const CountingIterator& other) const { return m_at != other.m_at; }
-
- private:
-  const char* m_at;
-  const char** m_reached;
-};
 
 // Where a document, which can be parsed, has the member or element that `wanted` leads to.
 class Finder {
